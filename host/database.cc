@@ -1,0 +1,258 @@
+#include "host/database.h"
+
+#include <sqlite3.h>
+
+#include <filesystem>
+
+#include "host/error.h"
+
+namespace host {
+
+std::string quoteIdent(std::string_view name) {
+  std::string out = "\"";
+  for (char c : name) {
+    if (c == '"') out += '"';
+    out += c;
+  }
+  return out + "\"";
+}
+
+std::string quoteText(std::string_view text) {
+  std::string out = "'";
+  for (char c : text) {
+    if (c == '\'') out += '\'';
+    out += c;
+  }
+  return out + "'";
+}
+
+namespace {
+
+[[noreturn]] void fail(sqlite3* db, std::string_view what) {
+  throw HostError(std::string(what) + " : " + (db ? sqlite3_errmsg(db) : "base inaccessible"));
+}
+
+Genre genreOf(const std::string& declared) {
+  std::string first = declared.substr(0, declared.find(' '));
+  if (first == "DATE") return Genre::Date;
+  if (first == "MONEY") return Genre::Monnaie;
+  if (first == "RATE" || first == "REAL") return Genre::Double;
+  if (first == "INTEGER") return Genre::Entier;
+  return Genre::Texte;
+}
+
+sqlite3* openFile(const std::string& path, int flags) {
+  sqlite3* db = nullptr;
+  if (sqlite3_open_v2(path.c_str(), &db, flags, nullptr) != SQLITE_OK) {
+    std::string message = db ? sqlite3_errmsg(db) : "échec d'ouverture";
+    sqlite3_close(db);
+    throw HostError("dossier « " + path + " » : " + message);
+  }
+  sqlite3_busy_timeout(db, 10000);
+  sqlite3_extended_result_codes(db, 1);
+  return db;
+}
+
+}  // namespace
+
+// ---------------------------------------------------------------------------- Statement
+
+Statement& Statement::bind(int index, std::string_view text) {
+  if (sqlite3_bind_text(stmt_, index, text.data(), static_cast<int>(text.size()), SQLITE_TRANSIENT) != SQLITE_OK)
+    fail(db_, "liaison d'une valeur");
+  return *this;
+}
+
+Statement& Statement::bind(int index, long long n) {
+  if (sqlite3_bind_int64(stmt_, index, n) != SQLITE_OK) fail(db_, "liaison d'une valeur");
+  return *this;
+}
+
+Statement& Statement::bind(int index, double d) {
+  if (sqlite3_bind_double(stmt_, index, d) != SQLITE_OK) fail(db_, "liaison d'une valeur");
+  return *this;
+}
+
+Statement& Statement::bind(int index, const Valeur& v) {
+  switch (v.genre()) {
+    case Genre::Entier: return bind(index, v.entier());
+    case Genre::Double:
+    case Genre::Simple: return bind(index, v.reel());
+    default: return bind(index, std::string_view(v.stockage()));
+  }
+}
+
+bool Statement::step() {
+  int rc = sqlite3_step(stmt_);
+  if (rc == SQLITE_ROW) return true;
+  if (rc == SQLITE_DONE) return false;
+  std::string message = sqlite3_errmsg(db_);
+  sqlite3_reset(stmt_);
+  throw HostError("base de données : " + message);
+}
+
+void Statement::reset() {
+  sqlite3_reset(stmt_);
+  sqlite3_clear_bindings(stmt_);
+}
+
+int Statement::columnCount() const { return sqlite3_column_count(stmt_); }
+
+std::string Statement::text(int column) const {
+  const unsigned char* p = sqlite3_column_text(stmt_, column);
+  return p ? std::string(reinterpret_cast<const char*>(p), static_cast<std::size_t>(sqlite3_column_bytes(stmt_, column)))
+           : std::string();
+}
+
+long long Statement::integer(int column) const { return sqlite3_column_int64(stmt_, column); }
+double Statement::real(int column) const { return sqlite3_column_double(stmt_, column); }
+bool Statement::isNull(int column) const { return sqlite3_column_type(stmt_, column) == SQLITE_NULL; }
+
+// ---------------------------------------------------------------------------- Database
+
+std::unique_ptr<Database> Database::creer(const std::string& path) {
+  sqlite3* db = openFile(path, SQLITE_OPEN_READWRITE | SQLITE_OPEN_CREATE);
+  auto result = std::unique_ptr<Database>(new Database(db, path));
+  result->exec("PRAGMA foreign_keys = ON");
+  return result;
+}
+
+std::unique_ptr<Database> Database::ouvrir(const std::string& path) {
+  if (!std::filesystem::exists(path)) throw HostError("dossier « " + path + " » introuvable");
+  sqlite3* db = openFile(path, SQLITE_OPEN_READWRITE);
+  auto result = std::unique_ptr<Database>(new Database(db, path));
+  std::string version;
+  try {
+    Statement& s = result->prepare("SELECT VALEUR FROM DOSSIER_INFO WHERE CLE = 'schema_version'");
+    if (s.step()) version = s.text(0);
+    s.reset();
+  } catch (const HostError&) {
+    throw HostError("« " + path + " » n'est pas un dossier");
+  }
+  if (version != kSchemaVersion)
+    throw HostError("le dossier « " + path + " » est de la version " + (version.empty() ? "?" : version) +
+                    " du schéma ; ce programme lit la version " + kSchemaVersion);
+  result->exec("PRAGMA journal_mode = WAL");
+  return result;
+}
+
+Database::~Database() {
+  wrappers_.clear();
+  statements_.clear();
+  sqlite3_close(db_);
+}
+
+void Database::exec(std::string_view sql) {
+  char* error = nullptr;
+  std::string text(sql);
+  if (sqlite3_exec(db_, text.c_str(), nullptr, nullptr, &error) != SQLITE_OK) {
+    std::string message = error ? error : "erreur";
+    sqlite3_free(error);
+    throw HostError("base de données : " + message);
+  }
+}
+
+Statement& Database::prepare(const std::string& sql) {
+  auto it = wrappers_.find(sql);
+  if (it != wrappers_.end()) {
+    it->second.reset();
+    return it->second;
+  }
+  sqlite3_stmt* stmt = nullptr;
+  if (sqlite3_prepare_v2(db_, sql.c_str(), static_cast<int>(sql.size()), &stmt, nullptr) != SQLITE_OK)
+    fail(db_, "requête « " + sql + " »");
+  statements_.emplace(sql, std::unique_ptr<sqlite3_stmt, void (*)(sqlite3_stmt*)>(
+                               stmt, [](sqlite3_stmt* s) { sqlite3_finalize(s); }));
+  return wrappers_.emplace(sql, Statement(db_, stmt)).first->second;
+}
+
+void Database::begin() {
+  if (depth_ == 0) exec("BEGIN IMMEDIATE");
+  ++depth_;
+}
+
+void Database::commit() {
+  if (depth_ == 0) return;
+  if (--depth_ == 0) exec("COMMIT");
+}
+
+void Database::rollback() {
+  if (depth_ == 0) return;
+  depth_ = 0;
+  for (auto& [sql, s] : wrappers_) s.reset();
+  exec("ROLLBACK");
+}
+
+const std::vector<Colonne>& Database::colonnes(const std::string& table) {
+  auto it = columns_.find(table);
+  if (it != columns_.end()) return it->second;
+  std::vector<Colonne> columns;
+  sqlite3_stmt* stmt = nullptr;
+  std::string sql = "PRAGMA table_info(" + quoteIdent(table) + ")";
+  if (sqlite3_prepare_v2(db_, sql.c_str(), -1, &stmt, nullptr) != SQLITE_OK) fail(db_, sql);
+  while (sqlite3_step(stmt) == SQLITE_ROW) {
+    std::string name = reinterpret_cast<const char*>(sqlite3_column_text(stmt, 1));
+    const unsigned char* type = sqlite3_column_text(stmt, 2);
+    columns.push_back({name, genreOf(type ? reinterpret_cast<const char*>(type) : ""), sqlite3_column_int(stmt, 5) > 0});
+  }
+  sqlite3_finalize(stmt);
+  if (columns.empty()) throw HostError("table « " + table + " » inconnue du dictionnaire");
+  return columns_.emplace(table, std::move(columns)).first->second;
+}
+
+std::vector<std::string> Database::colonnesIndex(const std::string& table, const std::string& index) {
+  std::vector<std::string> names;
+  sqlite3_stmt* stmt = nullptr;
+  std::string sql = "SELECT name FROM pragma_index_info(?) ORDER BY seqno";
+  if (sqlite3_prepare_v2(db_, sql.c_str(), -1, &stmt, nullptr) != SQLITE_OK) fail(db_, sql);
+  std::string full = table + "_" + index;
+  sqlite3_bind_text(stmt, 1, full.c_str(), -1, SQLITE_TRANSIENT);
+  while (sqlite3_step(stmt) == SQLITE_ROW) names.emplace_back(reinterpret_cast<const char*>(sqlite3_column_text(stmt, 0)));
+  sqlite3_finalize(stmt);
+  return names;
+}
+
+bool Database::existe(const std::string& table) {
+  Statement& s = prepare("SELECT 1 FROM sqlite_schema WHERE type = 'table' AND name = ? UNION ALL "
+                         "SELECT 1 FROM sqlite_temp_schema WHERE type = 'table' AND name = ?");
+  s.bind(1, table).bind(2, table);
+  bool found = s.step();
+  s.reset();
+  return found;
+}
+
+void Database::creerCopiePrivee(const std::string& model, const std::string& name) {
+  Statement& s = prepare("SELECT sql FROM main.sqlite_schema WHERE type = 'table' AND name = ?");
+  s.bind(1, model);
+  if (!s.step()) throw HostError("table « " + model + " » inconnue du dictionnaire");
+  std::string sql = s.text(0);
+  s.reset();
+  std::size_t open = sql.find('(');
+  forget(name);
+  exec("DROP TABLE IF EXISTS temp." + quoteIdent(name));
+  exec("CREATE TEMP TABLE " + quoteIdent(name) + " " + sql.substr(open));
+}
+
+void Database::supprimerCopiePrivee(const std::string& name) {
+  forget(name);
+  exec("DROP TABLE IF EXISTS temp." + quoteIdent(name));
+}
+
+void Database::forget(const std::string& table) {
+  columns_.erase(table);
+  // Statements over a dropped table would fail; drop every cached one that names it.
+  for (auto it = wrappers_.begin(); it != wrappers_.end();) {
+    if (it->first.find(quoteIdent(table)) != std::string::npos) {
+      statements_.erase(it->first);
+      it = wrappers_.erase(it);
+    } else {
+      ++it;
+    }
+  }
+}
+
+}  // namespace host
+
+namespace host {
+long long Database::dernierId() const { return sqlite3_last_insert_rowid(db_); }
+}  // namespace host

@@ -1,0 +1,103 @@
+// The one narrow door to the database. Everything above it (tables, services,
+// the ledger) speaks through Database and Statement, so that another engine can
+// be put behind them without touching the library.
+//
+// A dossier is one SQLite file. Several processes may open it at once: each unit
+// of work takes the write lock when it begins (BEGIN IMMEDIATE) and waits up to
+// the busy timeout for another process to finish its own, so units never
+// interleave and a unit is kept whole or not at all.
+#pragma once
+
+#include <map>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "host/value.h"
+
+struct sqlite3;
+struct sqlite3_stmt;
+
+namespace host {
+
+struct Colonne {
+  std::string name;
+  Genre genre;
+  bool key;  // part of the primary key
+};
+
+class Statement {
+ public:
+  Statement(sqlite3* db, sqlite3_stmt* stmt) : db_(db), stmt_(stmt) {}
+  // Values are always bound, never pasted into SQL text.
+  Statement& bind(int index, std::string_view text);
+  Statement& bind(int index, long long n);
+  Statement& bind(int index, double d);
+  Statement& bind(int index, const Valeur& v);
+  // True while a row is there; throws HostError on failure.
+  bool step();
+  void reset();
+  int columnCount() const;
+  std::string text(int column) const;
+  long long integer(int column) const;
+  double real(int column) const;
+  bool isNull(int column) const;
+
+ private:
+  sqlite3* db_;
+  sqlite3_stmt* stmt_;
+};
+
+class Database {
+ public:
+  static constexpr const char* kSchemaVersion = "1";
+
+  // Opens an existing dossier; throws HostError when the file is missing, is not a
+  // dossier, or has another schema version. The file is not changed on failure.
+  static std::unique_ptr<Database> ouvrir(const std::string& path);
+  // Opens or creates a plain database file (used to make a dossier, and in tests).
+  static std::unique_ptr<Database> creer(const std::string& path);
+  ~Database();
+
+  const std::string& chemin() const { return path_; }
+  void exec(std::string_view sql);
+  // A cached prepared statement, reset and unbound.
+  Statement& prepare(const std::string& sql);
+
+  // Units of work nest; only the outermost commits or rolls back.
+  void begin();
+  void commit();
+  void rollback();
+  int profondeur() const { return depth_; }
+
+  // Dictionary of a table (main or session-private); throws for an unknown table.
+  const std::vector<Colonne>& colonnes(const std::string& table);
+  std::vector<std::string> colonnesIndex(const std::string& table, const std::string& index);
+  bool existe(const std::string& table);
+  // Makes a private copy of a dossier table for this connection (work tables,
+  // memory images): same columns, same keys, no rows.
+  void creerCopiePrivee(const std::string& model, const std::string& name);
+  void supprimerCopiePrivee(const std::string& name);
+
+  long long dernierId() const;
+  sqlite3* brut() { return db_; }
+
+ private:
+  Database(sqlite3* db, std::string path) : db_(db), path_(std::move(path)) {}
+  void forget(const std::string& table);
+
+  sqlite3* db_;
+  std::string path_;
+  int depth_ = 0;
+  std::map<std::string, std::unique_ptr<sqlite3_stmt, void (*)(sqlite3_stmt*)>> statements_;
+  std::map<std::string, Statement> wrappers_;
+  std::map<std::string, std::vector<Colonne>> columns_;
+};
+
+// "NAME" quoted for SQL.
+std::string quoteIdent(std::string_view name);
+// 'text' quoted for SQL, quotes doubled.
+std::string quoteText(std::string_view text);
+
+}  // namespace host

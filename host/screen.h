@@ -1,0 +1,55 @@
+// The state of a screen, not its drawing: what a front end, a test or the demo reads.
+#pragma once
+
+#include <map>
+#include <set>
+#include <string>
+#include <vector>
+
+namespace host {
+
+class Ecran {
+ public:
+  // Object lists end with "" in the calls of the library: affiche("P1", "").
+  template <typename... Names>
+  void affiche(Names... names) { (redisplay(names), ...); }
+  template <typename... Names>
+  void autorise(Names... names) { (setForbidden(names, false), ...); }
+  template <typename... Names>
+  void interdit(Names... names) { (setForbidden(names, true), ...); }
+  template <typename... Names>
+  void cacher(Names... names) { (setHidden(names, true), ...); }
+  template <typename... Names>
+  void montrer(Names... names) { (setHidden(names, false), ...); }
+
+  // Caption of screen command n ("Infos fiche").
+  void commande(int n, std::string caption) { commands_[n] = std::move(caption); }
+  // Caption of a list column or any object.
+  void titre(const std::string& object, std::string caption) { captions_[object] = std::move(caption); }
+  // Switches the document on screen to visualisation.
+  void toVisu() { visu_requested_ = true; }
+
+  bool estInterdit(const std::string& name) const { return forbidden_.count(name) != 0; }
+  bool estCache(const std::string& name) const { return hidden_.count(name) != 0; }
+  std::string commandeLibelle(int n) const;
+  std::string titreDe(const std::string& object) const;
+  const std::vector<std::string>& affichages() const { return redisplayed_; }
+  bool visuDemandee() const { return visu_requested_; }
+  void oublierVisu() { visu_requested_ = false; }
+  const std::string& focus() const { return focus_; }
+  void setFocus(std::string name) { focus_ = std::move(name); }
+
+ private:
+  void redisplay(const char* name);
+  void setForbidden(const char* name, bool forbidden);
+  void setHidden(const char* name, bool hidden);
+
+  std::set<std::string> forbidden_, hidden_;
+  std::map<int, std::string> commands_;
+  std::map<std::string, std::string> captions_;
+  std::vector<std::string> redisplayed_;
+  std::string focus_;
+  bool visu_requested_ = false;
+};
+
+}  // namespace host

@@ -1,0 +1,169 @@
+// The user's session: one process working on one dossier for one user.
+//
+// The session holds the database connection, the work tables private to the
+// user, the screens that are open, the queue of procedures handed back to the
+// host, the user port and the transcript of what the user saw.
+//
+// One user action is one unit (action()): it begins a unit of work, runs the
+// handler, then the queued procedures in order, and commits. When a handler
+// raised a host error, or anything else escaped, the unit is rolled back whole:
+// a killed process or a failed action never leaves half its writes behind.
+#pragma once
+
+#include <deque>
+#include <functional>
+#include <map>
+#include <memory>
+#include <optional>
+#include <set>
+#include <string>
+#include <vector>
+
+#include "host/database.h"
+#include "host/registry.h"
+
+namespace host {
+
+class Automate;
+class Session;
+
+// What the user saw and did, in order. Kinds: "ouvre", "ferme", "message",
+// "question", "réponse", "dialogue", "choix", "refus", "erreur", "saisie", "action".
+struct Entree {
+  std::string sorte;
+  std::string texte;
+};
+
+class Transcript {
+ public:
+  void ajouter(std::string sorte, std::string texte);
+  const std::vector<Entree>& entrees() const { return entries_; }
+  // Texts of one kind, in order.
+  std::vector<std::string> textes(const std::string& sorte) const;
+  std::string rendu() const;  // one line an entry, for people
+  void vider() { entries_.clear(); }
+
+ private:
+  std::vector<Entree> entries_;
+};
+
+// The user. Screens never block on a terminal: every question comes here.
+class UserAgent {
+ public:
+  virtual ~UserAgent() = default;
+  virtual void message(const std::string& text) { (void)text; }
+  // A yes/no question; true for yes.
+  virtual bool oui(const std::string& question) = 0;
+  // A dialog; returns the answer code of the chosen choice.
+  virtual std::string dialogue(const std::string& title, const std::string& text,
+                               const std::vector<std::string>& choices) = 0;
+  // A choice window over rows; returns the picked row's key, or nothing (cancelled).
+  virtual std::optional<std::string> choisir(const std::string& window, const std::vector<std::string>& rows) = 0;
+  // Acts on a modal screen until it is closed (or there is nothing more to do).
+  virtual void piloter(Session& session, Automate& screen) = 0;
+};
+
+// Answers given in advance, in order. A question with no answer left is an
+// error (HostError naming the question), never a silent default.
+class ReponsesPreparees : public UserAgent {
+ public:
+  void ajouterOui(bool yes) { yes_no_.push_back(yes); }
+  void ajouterDialogue(std::string code) { dialogs_.push_back(std::move(code)); }
+  void ajouterChoix(std::optional<std::string> pick) { picks_.push_back(std::move(pick)); }
+  // Steps run on a modal screen, in order.
+  void ajouterPilotage(std::function<void(Session&, Automate&)> steps) { modal_.push_back(std::move(steps)); }
+
+  bool oui(const std::string& question) override;
+  std::string dialogue(const std::string& title, const std::string& text,
+                       const std::vector<std::string>& choices) override;
+  std::optional<std::string> choisir(const std::string& window, const std::vector<std::string>& rows) override;
+  void piloter(Session& session, Automate& screen) override;
+
+ private:
+  std::deque<bool> yes_no_;
+  std::deque<std::string> dialogs_;
+  std::deque<std::optional<std::string>> picks_;
+  std::deque<std::function<void(Session&, Automate&)>> modal_;
+};
+
+class Session {
+ public:
+  Session(std::unique_ptr<Database> db, UserAgent& agent, std::string user);
+  ~Session();
+  Session(const Session&) = delete;
+  Session& operator=(const Session&) = delete;
+
+  // The session of this process; throws HostError when none is open.
+  static Session& courante();
+  static bool existe();
+
+  Database& base() { return *db_; }
+  Transcript& transcript() { return transcript_; }
+  UserAgent& agent() { return *agent_; }
+  void setAgent(UserAgent& agent) { agent_ = &agent; }
+  const std::string& utilisateur() const { return user_; }
+  std::string dossier() const { return db_->chemin(); }
+
+  // ---- user actions
+  // Runs one user action as one unit. Returns false when it failed and was undone.
+  bool action(const std::function<void()>& act);
+  // Runs `act` inside the unit of the action under way, or as its own action.
+  void dansUnite(const std::function<void()>& act);
+  void signalerErreur(const std::string& event, const std::string& message);
+  bool actionEchouee() const { return failed_; }
+
+  // ---- screens and modules
+  // Opens a module beside its caller and returns at once.
+  Automate* ouvrir(AutomatePtr automate);
+  // Runs a module to its end (a screen runs its own loop of user actions).
+  void executer(AutomatePtr automate);
+  // Screens open, oldest first.
+  std::vector<Automate*> ecrans() const;
+  Automate* ecranCourant() const;
+  Automate* ecran(const std::string& code) const;
+  // Closes the screens that left (sortir); the one now in front is reactivated.
+  void fermerTermines();
+  void fermerTout();
+
+  // The instance of a procedure library ("CPMESSAG-INTERFACE") for this session.
+  Automate& bibliotheque(const std::string& name);
+
+  // ---- queued procedures
+  void enfiler(Automate* automate, std::string procedure);
+  void executerFile();
+
+  // ---- user port, with the transcript
+  void montrer(const std::string& text);
+  bool demander(const std::string& question);
+  std::string dialoguer(const std::string& title, const std::string& text, const std::vector<std::string>& choices);
+  std::optional<std::string> choisir(const std::string& window, const std::vector<std::string>& rows);
+  void oublierMessages(Automate* automate);
+
+  // ---- label tables
+  std::string libelle(const std::vector<std::string>& tables, std::string_view code);
+
+  // ---- work tables: the session's private copy, made on first use
+  void tableDeTravail(const std::string& name);
+
+ private:
+  struct Queued {
+    Automate* automate;
+    std::string procedure;
+  };
+  void forgetQueued(Automate* automate);
+  void close(Automate* automate);
+
+  std::unique_ptr<Database> db_;
+  UserAgent* agent_;
+  std::string user_;
+  Transcript transcript_;
+  std::vector<AutomatePtr> screens_;
+  std::map<std::string, AutomatePtr> libraries_;
+  std::deque<Queued> queue_;
+  std::set<std::string> work_tables_;
+  int action_depth_ = 0;
+  bool failed_ = false;
+  Session* previous_;
+};
+
+}  // namespace host
