@@ -164,8 +164,15 @@ std::string operator+(const Donnee& a, const Donnee& b);
     }
 
 HOST_VALUE_TYPE(Chaine, Genre::Texte)
+  // A library-global variable of a group: (name, label, third, access, group, owner).
+  Chaine(const char* nom, const char* libelle, const char* tiers, int acces, const char* groupe, Automate* o)
+      : Donnee(Genre::Texte, nom, libelle, tiers, acces, o), groupe_(groupe ? groupe : "") {}
+  const std::string& groupe() const { return groupe_; }
   // A text literal: Chaine("MIRVAE-ACCES1").
   explicit Chaine(std::string_view text = "") : Donnee(Valeur::texte(std::string(text))) {}
+
+ private:
+  std::string groupe_;
 };
 
 HOST_VALUE_TYPE(Entier, Genre::Entier)

@@ -1,0 +1,23 @@
+// Making and opening dossiers: one SQLite file each, holding the module's tables,
+// the accounting base's reference and ledger tables, and the label tables.
+#pragma once
+
+#include <chrono>
+#include <memory>
+#include <string>
+
+#include "host/database.h"
+
+namespace registry {
+
+// Creates a dossier at `path` with the whole dictionary and the label texts; with
+// `demo`, also the demo company, whose exercise is the calendar year of `today`.
+// Refuses (HostError) a path where a file already exists; a dossier that could not
+// be made whole is removed.
+void creerDossier(const std::string& path, bool demo, std::chrono::year_month_day today);
+
+// Opens an existing dossier (HostError when missing, not a dossier, or of another
+// schema version; the file is left untouched).
+std::unique_ptr<host::Database> ouvrirDossier(const std::string& path);
+
+}  // namespace registry

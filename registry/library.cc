@@ -1,0 +1,33 @@
+#include "registry/library.h"
+
+#include "host/registry.h"
+#include "host/value.h"
+#include "services/services.h"
+
+namespace registry {
+
+using host::Global;
+using host::Module;
+using host::Source;
+
+namespace {
+
+// The crash flag of the access screens' model; the library itself never reads it.
+host::Chaine* crashFlag = nullptr;
+
+void declarerUnites() {
+  // Units are added here in load order as their modules are built.
+}
+
+}  // namespace
+
+void chargerBibliotheque() {
+  static bool loaded = false;
+  if (loaded) return;
+  loaded = true;
+  crashFlag = new host::Chaine("$$|VCODECRASHFLAG", "", "", 2, "CRASHFLAG", nullptr);
+  declarerUnites();
+  services::chargerServices();
+}
+
+}  // namespace registry

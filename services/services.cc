@@ -1,0 +1,7 @@
+#include "services/services.h"
+
+namespace services {
+
+void chargerServices() {}
+
+}  // namespace services

@@ -1,0 +1,44 @@
+// A fresh demo dossier and an open session on it, for tests of every layer.
+#pragma once
+
+#include <gtest/gtest.h>
+
+#include <chrono>
+#include <filesystem>
+#include <memory>
+#include <string>
+
+#include "host/clock.h"
+#include "host/session.h"
+#include "registry/dossier.h"
+
+namespace testing_support {
+
+// Today in the tests: a fixed day, so that every date rule is repeatable.
+inline std::chrono::year_month_day jourDeTest() {
+  using namespace std::chrono;
+  return year_month_day{year(2024), month(3), day(15)};
+}
+
+// A unique file name in the temporary directory.
+std::string cheminTemporaire(const std::string& stem);
+
+class DossierTest : public ::testing::Test {
+ protected:
+  void SetUp() override;
+  void TearDown() override;
+  // Reopens the session (a new process on the same dossier).
+  void rouvrir();
+
+  host::Session& session() { return *session_; }
+  host::Database& base() { return session_->base(); }
+  // Runs one SQL query and returns the first column of the first row ("" when none).
+  std::string sql(const std::string& query);
+
+  bool demo_ = true;
+  std::string path_;
+  host::ReponsesPreparees user_;
+  std::unique_ptr<host::Session> session_;
+};
+
+}  // namespace testing_support
