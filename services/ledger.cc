@@ -1,0 +1,9 @@
+#include "services/ledger.h"
+
+#include "host/automate.h"
+
+namespace services {
+
+void ajouterProceduresPieces(host::Automate&) {}
+
+}  // namespace services
