@@ -1,0 +1,56 @@
+#!/usr/bin/env bash
+# Sets up what the project needs on a fresh Debian machine, builds, and runs either
+# the demo or the tests.
+#
+#   ./project.sh demo [ARGS...]   build, then run `mirvae demo ARGS...`
+#   ./project.sh test             build normally and under ASan+UBSan, run every test in both
+#   ./project.sh build            build the normal tree only (build/)
+set -euo pipefail
+cd "$(dirname "$0")"
+
+packages=(build-essential cmake ninja-build pkg-config libsqlite3-dev sqlite3 libboost-dev libcli11-dev
+          libgtest-dev libgmock-dev libbenchmark-dev hledger)
+
+install_missing() {
+  local missing=()
+  for p in "${packages[@]}"; do
+    dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q "install ok installed" || missing+=("$p")
+  done
+  if [ ${#missing[@]} -gt 0 ]; then
+    echo "Installing: ${missing[*]}"
+    local sudo=""
+    [ "$(id -u)" -eq 0 ] || sudo="sudo"
+    $sudo apt-get update -qq
+    DEBIAN_FRONTEND=noninteractive $sudo apt-get install -y -qq "${missing[@]}" >/dev/null
+  fi
+}
+
+build() {  # build DIR [extra cmake args]
+  local dir=$1
+  shift
+  cmake -S . -B "$dir" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo "$@" >/dev/null
+  cmake --build "$dir" -j "$(nproc)"
+}
+
+command=${1:-demo}
+shift || true
+install_missing
+case "$command" in
+  demo)
+    build build
+    exec ./build/mirvae demo "$@"
+    ;;
+  build)
+    build build
+    ;;
+  test)
+    build build
+    (cd build && ctest --output-on-failure -j "$(nproc)")
+    build build-asan -DMIRVAE_SANITIZE=ON -DMIRVAE_BENCH=OFF
+    (cd build-asan && ASAN_OPTIONS=detect_leaks=1 UBSAN_OPTIONS=print_stacktrace=1 ctest --output-on-failure -j "$(nproc)")
+    ;;
+  *)
+    echo "usage: $0 demo|test|build" >&2
+    exit 2
+    ;;
+esac

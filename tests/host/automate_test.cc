@@ -1,0 +1,152 @@
+#include "host/automate.h"
+
+#include <gtest/gtest.h>
+
+#include "host/error.h"
+#include "host/registry.h"
+#include "host/session.h"
+#include "model/traitmnt.h"
+#include "tests/support/fixture.h"
+
+namespace {
+
+using namespace host;
+
+std::vector<std::string> journal;
+
+// A callee that writes its reference parameter and reports through its result.
+struct Appele : model::Traitmnt {
+  Chaine SORTIE{"SORTIE", "", "", 0, this};
+  explicit Appele(Evt* e) : Traitmnt(e) {
+    addBranch("ECRIRE", &Appele::ecrire);
+    addBranch("DEBUT", &Appele::debut);
+    addBranch("FAIRE", &Appele::faire);
+  }
+  void ecrire(Evt* e) {
+    e->param(0, SORTIE, 1);
+    SORTIE = "écrit par l'appelé";
+    erreurMethode(1, e);
+  }
+  void debut(Evt*) override { journal.push_back("appelé DEBUT"); }
+  void faire(Evt*) override { journal.push_back("appelé FAIRE"); }
+};
+
+struct Lanceur : model::Traitmnt {
+  Chaine VALEUR{"VALEUR", "", "", 0, this};
+  explicit Lanceur(Evt* e) : Traitmnt(e) {
+    addBranch("AGIR", &Lanceur::agir);
+    addBranch("PLUS_TARD", &Lanceur::plus_tard);
+    addBranch("REFUSER", &Lanceur::refuser);
+    addBranch("CASSER", &Lanceur::casser);
+  }
+  void agir(Evt*) {
+    lancerProcedure("", "", "", "PLUS_TARD", nullptr, 0);
+    journal.push_back("agir fin");
+  }
+  void plus_tard(Evt*) { journal.push_back("plus tard"); }
+  void refuser(Evt* e) { rejeter(e); }
+  void casser(Evt*) { throw HostError("panne voulue"); }
+};
+
+class AutomateTest : public testing_support::DossierTest {
+ protected:
+  void SetUp() override {
+    DossierTest::SetUp();
+    journal.clear();
+    static bool registered = false;
+    if (!registered) {
+      registered = true;
+      Module("", "TEST-APPELE", &fabriquer<Appele>, false, "");
+      Module("", "TEST-LANCEUR", &fabriquer<Lanceur>, false, "");
+    }
+    lanceur_ = Registre::instance().creer("TEST-LANCEUR", nullptr);
+  }
+  void TearDown() override {
+    lanceur_.reset();
+    DossierTest::TearDown();
+  }
+  AutomatePtr lanceur_;
+};
+
+TEST_F(AutomateTest, ReferenceParameterWrittenByCalleeIsReadByCaller) {
+  auto& l = static_cast<Lanceur&>(*lanceur_);
+  EvtParamRef evt(1, &l.VALEUR);
+  l.appelerProcedure("*", "TEST", "APPELE", "ECRIRE", &evt, -1);
+  EXPECT_EQ(l.VALEUR, "écrit par l'appelé");
+  EXPECT_EQ(l.erreurMethode(), 1);
+}
+
+TEST_F(AutomateTest, ValueParameterIsACopy) {
+  auto& l = static_cast<Lanceur&>(*lanceur_);
+  l.VALEUR = "original";
+  EvtParamVal evt(1, &l.VALEUR);
+  l.appelerProcedure("*", "TEST", "APPELE", "ECRIRE", &evt, -1);
+  EXPECT_EQ(l.VALEUR, "original");
+}
+
+TEST_F(AutomateTest, QueuedProcedureRunsAfterItsCallersHandler) {
+  session().action([&] { lanceur_->executer("AGIR", nullptr); });
+  EXPECT_EQ(journal, (std::vector<std::string>{"agir fin", "plus tard"}));
+}
+
+TEST_F(AutomateTest, ModuleCalledByNameRunsToItsEnd) {
+  session().action([&] { lanceur_->appelerModule("", "TEST", "APPELE", nullptr); });
+  EXPECT_EQ(journal, (std::vector<std::string>{"appelé DEBUT", "appelé FAIRE"}));
+  EXPECT_EQ(session().transcript().textes("ferme"), std::vector<std::string>{"TEST-APPELE"});
+}
+
+TEST_F(AutomateTest, RefusedEventIsMarked) {
+  EvtParamVal evt(new InfoCode(0, 0, 0, 0, 0, 0));
+  lanceur_->executer("REFUSER", &evt);
+  EXPECT_TRUE(evt.rejete());
+  EXPECT_TRUE(lanceur_->refuse());
+}
+
+TEST_F(AutomateTest, HostErrorIsStampedWithItsEventAndUndoesTheAction) {
+  bool ok = session().action([&] {
+    base().exec("INSERT INTO NDOC (NOM, DERNIER) VALUES ('ESSAI', 1)");
+    lanceur_->executer("CASSER", nullptr);
+  });
+  EXPECT_FALSE(ok);
+  ASSERT_EQ(session().transcript().textes("erreur").size(), 1u);
+  EXPECT_EQ(session().transcript().textes("erreur")[0], "CASSER : panne voulue");
+  EXPECT_EQ(sql("SELECT count(*) FROM NDOC WHERE NOM = 'ESSAI'"), "0");
+}
+
+TEST_F(AutomateTest, BadNamesAndIndexesAreClearErrors) {
+  EXPECT_THROW(lanceur_->executer("INCONNUE", nullptr), HostError);
+  EXPECT_THROW(Registre::instance().creer("MIRVAE-NEANT", nullptr), HostError);
+  EXPECT_THROW(lanceur_->lancerProcedure("", "", "", "INCONNUE", nullptr, 0), HostError);
+  EvtParamVal evt(1, "seul");
+  Chaine c("C", "", "", 0, nullptr);
+  try {
+    evt.param(1, c, 0);
+    FAIL();
+  } catch (const HostError& e) {
+    EXPECT_NE(std::string(e.what()).find("paramètre 1"), std::string::npos);
+  }
+}
+
+TEST(Registre, ResolvesLibraryAndModuleToItsRegistryName) {
+  EXPECT_EQ(Registre::nomModule("", "MIRVAE", "GESTION1"), "MIRVAE-GESTION1");
+  EXPECT_EQ(Registre::nomModule("*", "CPMESSAG", "INTERFACE"), "CPMESSAG-INTERFACE");
+  EXPECT_EQ(Registre::nomModule("ZEFMDS", "$$", "NETTOYAGE_PARAMLST1_LISTE"), "ZEFMDS-NETTOYAGE_PARAMLST1_LISTE");
+  EXPECT_EQ(Registre::nomModule("", "", "AGIR"), "AGIR");
+}
+
+struct Casse : model::Traitmnt {
+  explicit Casse(Evt* e) : Traitmnt(e) { throw std::runtime_error("constructeur en échec"); }
+};
+
+class FabriqueTest : public testing_support::DossierTest {};
+
+TEST_F(FabriqueTest, AllocationFailureGivesNullAndConstructorFailurePassesThrough) {
+  refuserAllocations(1);
+  EXPECT_EQ(fabriquer<Appele>(nullptr), nullptr);
+  EXPECT_THROW(fabriquer<Casse>(nullptr), std::runtime_error);  // ASan proves the memory was released
+  auto* a = const_cast<Automate*>(fabriquer<Appele>(nullptr));
+  ASSERT_NE(a, nullptr);
+  DetruireAutomate{}(a);
+}
+
+}  // namespace
