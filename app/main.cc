@@ -1,2 +1,80 @@
+// mirvae: makes dossiers, plays session scripts, runs the demo, prints and exports
+// the ledger.
+#include <CLI/CLI.hpp>
+
+#include <fstream>
 #include <iostream>
-int main() { std::cout << "mirvae\n"; }
+
+#include "app/exports.h"
+#include "app/script.h"
+#include "host/clock.h"
+#include "host/error.h"
+#include "host/registry.h"
+#include "registry/dossier.h"
+#include "registry/library.h"
+
+int main(int argc, char** argv) {
+  CLI::App program{"Opérations simplifiées : saisie, contrôle et comptabilisation des opérations courantes"};
+  program.require_subcommand(1);
+
+  std::string dossier, script, format = "hledger", output;
+  bool demo = false;
+
+  CLI::App* init = program.add_subcommand("init", "Crée un dossier (fichier SQLite)");
+  init->add_option("DOSSIER", dossier, "Fichier du dossier à créer")->required();
+  init->add_flag("--demo", demo, "Remplit le dossier avec la société de démonstration");
+
+  program.add_subcommand("modules", "Liste les modules enregistrés, dans l'ordre de chargement");
+
+  CLI::App* run = program.add_subcommand("run", "Joue un script de session sur un dossier");
+  run->add_option("DOSSIER", dossier, "Dossier")->required()->check(CLI::ExistingFile);
+  run->add_option("SCRIPT", script, "Script de session")->required()->check(CLI::ExistingFile);
+
+  CLI::App* demoCommand = program.add_subcommand("demo", "Crée un dossier de démonstration et y saisit une facture client");
+  demoCommand->add_option("--dossier", dossier, "Fichier du dossier de démonstration (remplacé s'il existe)");
+
+  CLI::App* ledger = program.add_subcommand("ledger", "Imprime les pièces et mouvements du grand livre");
+  ledger->add_option("DOSSIER", dossier, "Dossier")->required()->check(CLI::ExistingFile);
+
+  CLI::App* exportCommand = program.add_subcommand("export", "Exporte le grand livre");
+  exportCommand->add_option("DOSSIER", dossier, "Dossier")->required()->check(CLI::ExistingFile);
+  exportCommand->add_option("--format", format, "Format d'export")->check(CLI::IsMember({"hledger"}));
+  exportCommand->add_option("-o,--output", output, "Fichier de sortie (sinon la sortie standard)");
+
+  CLI11_PARSE(program, argc, argv);
+
+  try {
+    registry::chargerBibliotheque();
+    if (init->parsed()) {
+      registry::creerDossier(dossier, demo, host::clock::today());
+      std::cout << "Dossier créé : " << dossier << (demo ? " (démonstration)" : "") << "\n";
+      return 0;
+    }
+    if (program.got_subcommand("modules")) {
+      for (const auto& name : host::Registre::instance().modules()) std::cout << name << "\n";
+      return 0;
+    }
+    if (run->parsed()) return app::jouerFichier(dossier, script, std::cout);
+    if (demoCommand->parsed()) return app::demo(dossier.empty() ? "demo.db" : dossier, std::cout);
+    if (ledger->parsed()) {
+      auto db = registry::ouvrirDossier(dossier);
+      app::imprimerGrandLivre(*db, std::cout);
+      return 0;
+    }
+    if (exportCommand->parsed()) {
+      auto db = registry::ouvrirDossier(dossier);
+      if (output.empty()) {
+        app::exporterHledger(*db, std::cout);
+      } else {
+        std::ofstream file(output);
+        app::exporterHledger(*db, file);
+        if (!file) throw host::HostError("écriture impossible dans « " + output + " »");
+      }
+      return 0;
+    }
+  } catch (const std::exception& e) {
+    std::cerr << "mirvae : " << e.what() << "\n";
+    return 1;
+  }
+  return 0;
+}
