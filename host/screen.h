@@ -4,6 +4,7 @@
 #include <map>
 #include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace host {
@@ -26,6 +27,11 @@ class Ecran {
   void commande(int n, std::string caption) { commands_[n] = std::move(caption); }
   // Caption of a list column or any object.
   void titre(const std::string& object, std::string caption) { captions_[object] = std::move(caption); }
+  void libelle(const std::string& object, std::string caption) { titre(object, std::move(caption)); }
+  // Applies list function n to a list (20: show the current line's new values).
+  // The state keeps which were applied, in order; the list itself is the model's.
+  void fonction(int n, const std::string& list) { functions_.emplace_back(n, list); }
+  const std::vector<std::pair<int, std::string>>& fonctions() const { return functions_; }
   // Switches the document on screen to visualisation.
   void toVisu() { visu_requested_ = true; }
 
@@ -48,6 +54,7 @@ class Ecran {
   std::map<int, std::string> commands_;
   std::map<std::string, std::string> captions_;
   std::vector<std::string> redisplayed_;
+  std::vector<std::pair<int, std::string>> functions_;
   std::string focus_;
   bool visu_requested_ = false;
 };

@@ -1,5 +1,7 @@
 #include "host/table.h"
 
+#include <map>
+
 #include "host/automate.h"
 #include "host/error.h"
 #include "host/session.h"
@@ -22,6 +24,17 @@ bool isWorkTable(const std::string& name) {
 
 long long memoryImageCounter = 0;
 
+// Memory images open in this process: (owner, image name) -> physical table and
+// the number of bindings on it. The last binding to go drops the table.
+struct SharedImage {
+  std::string physical;
+  int bindings = 0;
+};
+std::map<std::pair<const Automate*, std::string>, SharedImage>& sharedImages() {
+  static std::map<std::pair<const Automate*, std::string>, SharedImage> images;
+  return images;
+}
+
 }  // namespace
 
 Table::Table(Automate* owner, const char*, const char* name, const char* alias, void*, void*, int, int)
@@ -32,6 +45,11 @@ Table::Table(Automate* owner, const char*, const char* name, const char* alias, 
 Table::~Table() {
   if (owner_) owner_->oublierTable(this);
   if (private_copy_ && db_ && name_.rfind("MEM:", 0) == 0) {
+    if (owner_) {
+      auto it = sharedImages().find({owner_, name_});
+      if (it != sharedImages().end() && --it->second.bindings > 0) return;
+      if (it != sharedImages().end()) sharedImages().erase(it);
+    }
     try {
       db_->supprimerCopiePrivee(physical_);
     } catch (...) {
@@ -52,8 +70,15 @@ void Table::open() {
   Session& session = Session::courante();
   db_ = &session.base();
   if (name_.rfind("MEM:", 0) == 0) {
-    physical_ = name_ + "#" + std::to_string(++memoryImageCounter);
-    db_->creerCopiePrivee(name_.substr(4), physical_);
+    SharedImage* shared = owner_ ? &sharedImages()[{owner_, name_}] : nullptr;
+    if (shared && shared->bindings > 0) {
+      physical_ = shared->physical;
+    } else {
+      physical_ = name_ + "#" + std::to_string(++memoryImageCounter);
+      db_->creerCopiePrivee(name_.substr(4), physical_);
+      if (shared) shared->physical = physical_;
+    }
+    if (shared) ++shared->bindings;
     private_copy_ = true;
   } else {
     physical_ = name_;
@@ -95,6 +120,7 @@ void Table::initRequete() {
   open();
   filters_.clear();
   active_ = false;
+  request_text_.reset();
 }
 
 void Table::ajouteFiltre(Champ& field, char op, const Valeur& value, char) {
@@ -183,6 +209,7 @@ std::string Table::orderBy() const {
 
 std::string Table::requete() {
   open();
+  if (request_text_) return *request_text_;
   std::string sql = "Select * From " + quoteIdent(name_) + where(true);
   std::string order;
   for (const auto& c : order_) order += (order.empty() ? "" : ", ") + c;

@@ -15,7 +15,9 @@
 //     pasted into SQL. requete() gives the same request as text that SQLite runs,
 //     each condition written FIELD op 'value'.
 //   - A table whose name starts with "MEM:" is a memory image owned by its
-//     automaton: private, empty at first, dropped with the automaton. Work tables
+//     automaton: private, empty at first, dropped with the automaton. All the
+//     bindings of one image in one automaton (MEM_MIRVAANA and MEM_MIRVAANA2 on
+//     "MEM:MIRVAANA_M01") are cursors on the same rows. Work tables
 //     (_M01, _M02, MEM02, MEM04) are private to the session and shared by its
 //     automata. Every other table is the dossier's.
 // The binding opens lazily, at its first use, so a main table may be named after
@@ -61,6 +63,10 @@ class Table {
   void activeRequete();
   std::string requete();
   bool requeteActive() const { return active_; }
+  // A request given whole as SQL text (a print job's request): requete() gives it
+  // back until initRequete(). The cursor does not run it; the print model does.
+  void setRequestText(std::string sql) { request_text_ = std::move(sql); }
+  const std::optional<std::string>& requestText() const { return request_text_; }
 
   // ---- reading: 0 when a row was read, non-zero when there is none (buffer kept)
   int lit(int mode, Champ& field, char op, const Valeur& value);
@@ -114,6 +120,7 @@ class Table {
   std::vector<Filtre> filters_;
   std::vector<std::string> order_;
   bool active_ = false;
+  std::optional<std::string> request_text_;
 };
 
 // A field of a binding, used like a value: reading gives the buffer's value,

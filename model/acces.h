@@ -1,0 +1,105 @@
+// Access screens: a criteria form above a list of the main table's rows.
+// Chain: Acces2 : Acces : Scritere : Traitecr : Traitbas.
+//
+// Start, in order: "INIT", "AVANT_DEBUT", "DEBUT" (any of them may leave through
+// sortir, or be refused: the screen then leaves), then "ACTIVE_REQUETE" and the
+// list is filled.
+//
+// The list "LST" shows the rows of the main table's request. Its base answer to
+// "ACTIVE_REQUETE" (Scritere::active_requete) marks the list as out of date; the
+// handler then sets the main table's filters and index, and the list is refilled
+// once the user action is over (after the queued procedures): for each row of the
+// request (suivant 3, then 1) "LST_SELECTION" runs with the main table's buffer on
+// that row; a refused row is dropped, an accepted one is shown with a snapshot of
+// the main table's fields and of the screen variables as the handler left them.
+// Then "LST_LISTE_VIDE" or "LST_LISTE_PLEINE" runs, and the first row is selected.
+//
+// Selecting a row (selectRow) puts the main table's buffer on that row, so that
+// the actions ("GERER", "CREER", ... branches run by name) act on it. When the
+// screen comes back in front of the user (another screen closed), "DEBUT_ACTIVATION"
+// runs (its base runs "ACTIVE_REQUETE") and the list is refilled.
+#pragma once
+
+#include <map>
+#include <string>
+#include <vector>
+
+#include "host/value.h"
+#include "model/row_text.h"
+#include "model/traitecr.h"
+
+namespace model {
+
+class Scritere : public Traitecr {
+ public:
+  explicit Scritere(Evt* e);
+
+  // "ACTIVE_REQUETE": the base marks the list out of date. A handler calls it
+  // first, then sets the request of the main table.
+  virtual void active_requete(Evt* e);
+
+  // Refills the list if it is out of date (see above). The start cycle and every
+  // user action on the screen (model/mains.h) call it inside their unit.
+  void refreshList();
+  bool listOutOfDate() const { return out_of_date_; }
+
+  // Rows shown, in list order.
+  const std::vector<RowText>& rows() const { return rows_; }
+  // Selects row n (from 1): the main table's buffer is read again on that row.
+  // Throws HostError for a row the list does not show.
+  void selectRow(int n);
+  // Row selected (from 1), 0 when the list is empty.
+  int selectedRow() const { return selected_; }
+
+  void demarrer() override;
+  void reactiver() override;
+
+ protected:
+  // Steps of the start before "ACTIVE_REQUETE" ("INIT", "AVANT_DEBUT", "DEBUT").
+  virtual bool startSteps();
+
+ private:
+  struct Shown {
+    RowText text;
+    std::vector<std::pair<std::string, host::Valeur>> keys;  // primary key of the row
+  };
+  void fill();
+
+  bool out_of_date_ = true;
+  std::vector<Shown> shown_;
+  std::vector<RowText> rows_;
+  int selected_ = 0;
+};
+
+class Acces : public Scritere {
+ public:
+  explicit Acces(Evt* e);
+
+  // "INIT": the base does nothing more than a free screen's.
+  void init(Evt* e) override;
+  // "AVANT_DEBUT": the base accepts.
+  virtual void avant_debut(Evt* e);
+  // "DEBUT_ACTIVATION": the screen is back in front; the base runs "ACTIVE_REQUETE".
+  virtual void debut_activation(Evt* e);
+  // The list's standard actions. Their base does nothing: each screen decides what
+  // they open.
+  virtual void creer(Evt* e);
+  virtual void modifier(Evt* e);
+  virtual void gerer(Evt* e);
+  virtual void impr_fiche(Evt* e);
+  virtual void impr_liste(Evt* e);
+
+ protected:
+  bool startSteps() override;
+};
+
+class Acces2 : public Acces {
+ public:
+  explicit Acces2(Evt* e);
+
+  // "AVANT_DEBUT": the base of the access screens; a handler ends with it when its
+  // own checks passed.
+  void avant_debut(Evt* e) override;
+};
+
+}  // namespace model
