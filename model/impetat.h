@@ -11,10 +11,11 @@
 //      otherwise the record itself. Per body row "LST_DEBUT_FICHE",
 //      "LST_DEBUT1_IMPRIME" and "LST_CORPS_IMPRIME" run;
 //   3. the end.
-// The job writes to the printer (model/impression.h) one document: a first line
-// with its module's name, then per record a line "fiche" and per body row a line
-// "ligne", each with the row's identifier and the job's variables as filled by the
-// handlers ("NAME=value", separated by " | "), which is what a layout prints.
+// The job writes to the printer (model/impression.h) one document, under its
+// module's name and request: per record with lines a line "fiche", and per body
+// row a line "ligne", each with the row's key (IDENT, or the line's NUMERO) and the
+// job's variables as the handlers left them ("NAME=value", separated by " | "),
+// which is what a layout prints.
 //
 // The request is run as it is given, once checked to be a single statement that
 // only reads; "TABLE" in it (the form requests say "Select * From TABLE Where

@@ -1,27 +1,218 @@
 #include "model/mains.h"
 
+#include <functional>
+
 #include "host/automate.h"
 #include "host/error.h"
+#include "host/registry.h"
+#include "host/table.h"
+#include "model/acces.h"
+#include "model/sdocum.h"
+#include "model/step.h"
 
 namespace model {
 
-host::Automate& ecranDevant(host::Session& session) {
-  host::Automate* front = session.ecranCourant();
-  if (!front) throw host::HostError("aucun écran n'est ouvert");
+namespace {
+
+using host::Automate;
+using host::HostError;
+using host::Session;
+
+// A screen object as the hands reach it: a variable, or a field of a binding.
+struct Target {
+  host::Donnee* variable = nullptr;
+  host::Table* table = nullptr;
+  std::string column;
+  bool listColumn = false;
+  std::string branch;  // the branch run when the object is left ("" when none)
+
+  host::Valeur read() const { return variable ? variable->valeur() : table->valeur(column); }
+  void write(const host::Valeur& v) const {
+    if (variable)
+      variable->affecter(v);
+    else
+      table->affecter(column, v);
+  }
+  void writeText(const std::string& text, const std::string& object) const {
+    if (variable) {
+      variable->affecterTexte(text);
+      return;
+    }
+    for (const host::Colonne& c : table->colonnes())
+      if (c.name == column) table->affecter(column, host::Valeur::depuisTexte(c.genre, text, object));
+  }
+};
+
+Target resolve(Automate& screen, const std::string& object) {
+  Target t;
+  std::string name = object;
+  auto* document = dynamic_cast<Sdocum*>(&screen);
+  if (document && !document->listName().empty() && object.rfind(document->listName() + "_", 0) == 0) {
+    t.listColumn = true;
+    name = object.substr(document->listName().size() + 1);
+  }
+  if (std::size_t dot = name.find('.'); dot != std::string::npos) {
+    std::string alias = name.substr(0, dot);
+    t.column = name.substr(dot + 1);
+    t.table = alias == screen.table(false)->alias() ? screen.table(false) : screen.tableNommee(alias);
+    if (!t.table) throw HostError("table « " + alias + " » inconnue de l'écran « " + screen.code() + " »");
+    bool known = false;
+    for (const host::Colonne& c : t.table->colonnes()) known = known || c.name == t.column;
+    if (!known) throw HostError("champ « " + name + " » inconnu de l'écran « " + screen.code() + " »");
+    // A field of the main table is handled under its bare name ("DTOPE").
+    if (!t.listColumn && !screen.aBranche(object) && t.table == screen.table(false)) name = t.column;
+  } else {
+    t.variable = screen.variable(name);
+    if (!t.variable) throw HostError("objet « " + object + " » inconnu de l'écran « " + screen.code() + " »");
+  }
+  std::string branch = t.listColumn || screen.aBranche(object) ? object : name;
+  if (screen.aBranche(branch)) t.branch = branch;
+  return t;
+}
+
+// The screen catches up with what the action did: an access list is refilled, a
+// document asked to switch to visualisation does.
+void catchUp(Automate& screen) {
+  if (screen.estTermine()) return;
+  if (auto* list = dynamic_cast<Scritere*>(&screen)) list->refreshList();
+  if (auto* document = dynamic_cast<Saisie*>(&screen)) document->applyVisuRequest();
+}
+
+// One user action on the screen in front: `body` returns whether it was accepted.
+// The queued procedures run inside the action, then the screen catches up.
+bool act(Session& session, const std::string& kind, const std::string& text, const std::function<bool(Automate&)>& body) {
+  Automate& screen = ecranDevant(session);
+  session.transcript().ajouter(kind, text);
+  bool accepted = false;
+  std::string focus;
+  bool ok = session.action([&] {
+    if (auto* document = dynamic_cast<Sdocum*>(&screen)) document->forgetRefusedControl();
+    accepted = body(screen);
+    session.executerFile();
+    catchUp(screen);
+    focus = screen.ecran()->focus();
+  });
+  if (ok && !accepted)
+    session.transcript().ajouter("refus", focus.empty() || focus == text ? text : text + " (" + focus + ")");
+  return ok && accepted;
+}
+
+Sdocum& documentInFront(Session& session) {
+  auto* document = dynamic_cast<Sdocum*>(&ecranDevant(session));
+  if (!document) throw HostError("l'écran « " + ecranDevant(session).code() + " » n'a pas de liste de lignes");
+  return *document;
+}
+
+bool lineAction(Session& session, const std::string& text, bool (Sdocum::*move)()) {
+  documentInFront(session);
+  return act(session, "action", text, [move](Automate& a) { return (static_cast<Sdocum&>(a).*move)(); });
+}
+
+}  // namespace
+
+Automate& ecranDevant(Session& session) {
+  Automate* front = session.ecranCourant();
+  if (!front) throw HostError("aucun écran n'est ouvert");
   return *front;
 }
-bool ouvrir(host::Session&, const std::string&) { return false; }
-void fermer(host::Session&) {}
-bool saisir(host::Session&, const std::string&, const std::string&) { return false; }
-bool appuyer(host::Session&, const std::string&) { return false; }
-bool ouvrirChoix(host::Session&, const std::string&) { return false; }
-bool nouvelleLigne(host::Session&) { return false; }
-bool allerLigne(host::Session&, int) { return false; }
-bool validerLigne(host::Session&) { return false; }
-bool supprimerLigne(host::Session&) { return false; }
-bool abandonnerLigne(host::Session&) { return false; }
-std::vector<RowText> lignes(host::Session&) { return {}; }
-bool choisirLigne(host::Session&, int) { return false; }
-std::string valeur(host::Session&, const std::string&) { return ""; }
+
+bool ouvrir(Session& session, const std::string& name) {
+  if (!host::Registre::instance().module(name)) throw HostError("module « " + name + " » inconnu");
+  return session.action([&] {
+    session.ouvrir(host::Registre::instance().creer(name, nullptr));
+    session.executerFile();
+    if (Automate* front = session.ecranCourant()) catchUp(*front);
+  });
+}
+
+void fermer(Session& session) {
+  act(session, "action", "fermer", [](Automate& a) {
+    a.sortir(nullptr, 0);
+    return true;
+  });
+}
+
+bool saisir(Session& session, const std::string& object, const std::string& text) {
+  Target target = resolve(ecranDevant(session), object);
+  return act(session, "saisie", object + " = " + text, [&](Automate& a) {
+    auto* document = dynamic_cast<Sdocum*>(&a);
+    auto* saisie = dynamic_cast<Saisie*>(&a);
+    if (a.ecran()->estInterdit(object) || a.ecran()->estCache(object)) return false;
+    if (saisie && saisie->modeCourant() != "C" && saisie->modeCourant() != "M") return false;
+    if (target.listColumn) {
+      if (!document || !document->beginLineChange()) return false;
+    } else if (document) {
+      document->leaveList();
+    }
+    host::Chaine control(object);
+    host::EvtParamRef about(1, &control);
+    if (step(a, "CTRL_DEBUT_MODIF", &about) != Outcome::accepted) return false;
+    if (!target.branch.empty() && step(a, target.branch + "_ENTREE") != Outcome::accepted) return false;
+    host::Valeur before = target.read();
+    try {
+      target.writeText(text, object);
+    } catch (const HostError& error) {
+      a.BoiteMessage(error.what(), 0, nullptr);
+      a.controler(object.c_str(), "");
+      return false;
+    }
+    if (target.branch.empty()) return true;
+    if (step(a, target.branch) != Outcome::refused) return true;
+    target.write(before);
+    if (a.ecran()->focus().empty()) a.controler(object.c_str(), "");
+    return false;
+  });
+}
+
+bool appuyer(Session& session, const std::string& action) {
+  Automate& screen = ecranDevant(session);
+  if (!screen.aBranche(action)) throw HostError("action « " + action + " » inconnue de l'écran « " + screen.code() + " »");
+  return act(session, "action", action, [&](Automate& a) { return step(a, action) != Outcome::refused; });
+}
+
+bool ouvrirChoix(Session& session, const std::string& object) {
+  Target target = resolve(ecranDevant(session), object);
+  const char* event = target.listColumn ? "CTRL_OUVRE" : "CTRL_CHOISIR";
+  return act(session, "action", std::string("choix ") + object, [&](Automate& a) {
+    host::Chaine control(object);
+    host::EvtParamRef about(1, &control);
+    return step(a, event, &about) != Outcome::refused;
+  });
+}
+
+bool nouvelleLigne(Session& session) { return lineAction(session, "nouvelle ligne", &Sdocum::newLine); }
+bool validerLigne(Session& session) { return lineAction(session, "valider la ligne", &Sdocum::validateLine); }
+bool supprimerLigne(Session& session) { return lineAction(session, "supprimer la ligne", &Sdocum::deleteLine); }
+bool abandonnerLigne(Session& session) { return lineAction(session, "abandonner la ligne", &Sdocum::abandonLine); }
+
+bool allerLigne(Session& session, int n) {
+  Sdocum& document = documentInFront(session);
+  if (n < 1 || n > static_cast<int>(document.rows().size()))
+    throw HostError("la liste « " + document.listName() + " » n'a pas de ligne " + std::to_string(n));
+  return act(session, "action", "ligne " + std::to_string(n),
+             [n](Automate& a) { return static_cast<Sdocum&>(a).goToLine(n); });
+}
+
+std::vector<RowText> lignes(Session& session) {
+  Automate& screen = ecranDevant(session);
+  if (auto* list = dynamic_cast<Scritere*>(&screen)) return list->rows();
+  if (auto* document = dynamic_cast<Sdocum*>(&screen)) return document->rows();
+  throw HostError("l'écran « " + screen.code() + " » n'a pas de liste");
+}
+
+bool choisirLigne(Session& session, int n) {
+  auto* list = dynamic_cast<Scritere*>(&ecranDevant(session));
+  if (!list) throw HostError("l'écran « " + ecranDevant(session).code() + " » n'a pas de liste d'accès");
+  if (n < 1 || n > static_cast<int>(list->rows().size()))
+    throw HostError("la liste n'a pas de ligne " + std::to_string(n));
+  return act(session, "action", "choisir la ligne " + std::to_string(n), [n](Automate& a) {
+    static_cast<Scritere&>(a).selectRow(n);
+    return true;
+  });
+}
+
+std::string valeur(Session& session, const std::string& object) {
+  return resolve(ecranDevant(session), object).read().chaine();
+}
 
 }  // namespace model

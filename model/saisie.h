@@ -28,10 +28,12 @@
 // validated first; then "VALIDATION". Its base (Saisie::validation), which a
 // handler calls once its checks passed, saves: the header (a new one gets its
 // IDENT from the counter "MIRVAE" of NDOC, 8 characters), then the lines (see
-// Sdocum). A refusal before the base saves nothing. Once saved: "APRES_VALIDATION";
-// for a creation, "FIN_CREATION", then "DIALOGUE" with TYPE "VA_CREAT" (REPONSE 0:
-// the screen leaves; otherwise the saved document stays on screen, in modification
-// when allowed, else in visualisation).
+// Sdocum). A refusal before the base saves nothing. Once saved: "APRES_VALIDATION",
+// and the lines are read again as saved. For a creation then "FIN_CREATION" and
+// "DIALOGUE" with TYPE "VA_CREAT", which asks whether to go on creating: REPONSE 1
+// starts a new creation ("CREATION"); 0 leaves the saved document on screen in
+// visualisation (or closes the screen when visualisation is not allowed). A
+// modification stays in modification.
 //
 // Deletion ("SUPPRESSION", allowed by "A"): "AVANT_SUPPRESSION", whose base
 // (Saisie::avant_suppression) allows it; then, per saved line,
@@ -116,21 +118,26 @@ class Saisie : public AutomTab {
   // Identifier of the document on screen ("" in creation until it is saved).
   std::string identifiantDocument();
 
+  // Applies a switch to visualisation asked by a handler (Ecran::toVisu) to a
+  // document in modification. The cycle and the user's hands call it after each
+  // step or action.
+  void applyVisuRequest();
+
  protected:
   // Switches to mode `m` and runs its start event.
   void enterMode(char m);
   // Reads the document `ident` (SELECTION_TRI included); false when it is not shown.
   bool openDocument(const std::string& ident);
-  // Ends a line entry before the document is saved or left; false when the line was
+  // Ends a line entry before the document is saved; false when the line was
   // refused. Documents without lines have none.
   virtual bool closeLineEntry() { return true; }
+  // Drops a line entry (the document is abandoned, deleted or shown read-only).
+  virtual void discardLineEntry() {}
   // Line storage, given by Sdocum. `extract` runs the extraction data step per line.
   virtual void loadLines(bool extract) { (void)extract; }
   virtual void clearLines() {}
   virtual void saveLines(const std::string& ident) { (void)ident; }
   virtual void deleteLines(const std::string& ident) { (void)ident; }
-  // Applies a switch to visualisation asked by a handler (Ecran::toVisu).
-  void applyVisuRequest();
 
   // Set by the bases that allow what the cycle then does.
   bool saved_ = false;

@@ -73,7 +73,7 @@ class Sdocum : public Setape {
 
   // ---- standard events; each is the base of the branch of its upper-case name
   // "DIALOGUE": parameters TYPE (text) and REPONSE (integer, returned). The base
-  // asks the user: for "VA_CREAT", whether to carry on working on the screen after
+  // asks the user a yes/no question: for "VA_CREAT", whether to go on creating once
   // a creation was saved (REPONSE 1 yes, 0 no).
   virtual void dialogue(Evt* e);
   // "APRES_VALIDATION", "APRES_DEBUT_CREATION", "APRES_ABANDON": after those steps;
@@ -137,6 +137,7 @@ class Sdocum : public Setape {
 
  protected:
   bool closeLineEntry() override;
+  void discardLineEntry() override;
   void loadLines(bool extract) override;
   void clearLines() override;
   void saveLines(const std::string& ident) override;
