@@ -1,5 +1,8 @@
 #include "model/gestion_document.h"
 
+#include "host/table.h"
+#include "model/step.h"
+
 namespace model {
 
 Gestion_document::Gestion_document(Evt* e) : Sdocum(e) {
@@ -16,6 +19,21 @@ Gestion_document2::Gestion_document2(Evt* e) : Gestion_document(e) {
 void Gestion_document2::avant_debut(Evt*) {}
 void Gestion_document2::ctrl_choisir(Evt*) {}
 void Gestion_document2::debut_fiche(Evt*) {}
-void Gestion_document2::creation2(Evt*) {}
+void Gestion_document2::creation2(Evt* e) {
+  std::string mode = modeCourant();
+  if (!modePermis('C') || (mode != "M" && mode != "V")) {
+    rejeter(e);
+    return;
+  }
+  discardLineEntry();
+  Table& header = *table(false);
+  makeNew(header);
+  header.affecter("IDENT", Valeur::texte(""));
+  clearLines();
+  // The copy keeps the header as the handler left it: no "DEBUT_CREATION".
+  enterMode('C', false);
+  if (step(*this, "DEBUT_FICHE") == Outcome::stopped) return;
+  step(*this, "APRES_DEBUT_CREATION");
+}
 
 }  // namespace model

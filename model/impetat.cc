@@ -38,20 +38,21 @@ std::string withMainTable(const std::string& sql, const std::string& table) {
   return out;
 }
 
-// Prepares `sql` and checks that it is one statement that only reads.
-Prepared prepareReading(Database& db, const std::string& sql) {
+// Prepares `sql` and checks that it is one statement that only reads; errors name
+// the request as it was given.
+Prepared prepareReading(Database& db, const std::string& sql, const std::string& given) {
   sqlite3_stmt* raw = nullptr;
   const char* tail = nullptr;
   if (sqlite3_prepare_v2(db.brut(), sql.c_str(), -1, &raw, &tail) != SQLITE_OK || !raw) {
     std::string why = sqlite3_errmsg(db.brut());
     sqlite3_finalize(raw);
-    throw HostError("requête d'impression illisible (" + why + ") : " + sql);
+    throw HostError("requête d'impression illisible (" + why + ") : " + given);
   }
   Prepared stmt(raw, sqlite3_finalize);
   for (; tail && *tail; ++tail)
     if (!std::isspace(static_cast<unsigned char>(*tail)))
-      throw HostError("une requête d'impression est une seule instruction : " + sql);
-  if (!sqlite3_stmt_readonly(raw)) throw HostError("une requête d'impression ne fait que lire : " + sql);
+      throw HostError("une requête d'impression est une seule instruction : " + given);
+  if (!sqlite3_stmt_readonly(raw)) throw HostError("une requête d'impression ne fait que lire : " + given);
   return stmt;
 }
 
@@ -78,7 +79,7 @@ Impetat::Impetat(Evt* e) : Traitmnt(e) {
 }
 
 void Impetat::applyRequest(const std::string& sql) {
-  prepareReading(session().base(), withMainTable(sql, nomTable()));
+  prepareReading(session().base(), withMainTable(sql, nomTable()), sql);
   request_ = sql;
   table(false)->setRequestText(sql);
 }
@@ -100,7 +101,7 @@ void Impetat::demarrer() {
     main.activeRequete();
     for (int rc = main.suivant(3); rc == 0; rc = main.suivant(1)) keys.push_back(main.valeur(key));
   } else {
-    Prepared stmt = prepareReading(session().base(), withMainTable(request_, nomTable()));
+    Prepared stmt = prepareReading(session().base(), withMainTable(request_, nomTable()), request_);
     int column = -1;
     for (int i = 0; i < sqlite3_column_count(stmt.get()); ++i)
       if (key == sqlite3_column_name(stmt.get(), i)) column = i;

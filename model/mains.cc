@@ -80,7 +80,10 @@ void catchUp(Automate& screen) {
 
 // One user action on the screen in front: `body` returns whether it was accepted.
 // The queued procedures run inside the action, then the screen catches up.
-bool act(Session& session, const std::string& kind, const std::string& text, const std::function<bool(Automate&)>& body) {
+// A refusal names the action, and the control that has the focus when it is not
+// `object`.
+bool act(Session& session, const std::string& kind, const std::string& text, const std::string& object,
+         const std::function<bool(Automate&)>& body) {
   Automate& screen = ecranDevant(session);
   session.transcript().ajouter(kind, text);
   bool accepted = false;
@@ -93,7 +96,7 @@ bool act(Session& session, const std::string& kind, const std::string& text, con
     focus = screen.ecran()->focus();
   });
   if (ok && !accepted)
-    session.transcript().ajouter("refus", focus.empty() || focus == text ? text : text + " (" + focus + ")");
+    session.transcript().ajouter("refus", focus.empty() || focus == object ? text : text + " (" + focus + ")");
   return ok && accepted;
 }
 
@@ -105,7 +108,7 @@ Sdocum& documentInFront(Session& session) {
 
 bool lineAction(Session& session, const std::string& text, bool (Sdocum::*move)()) {
   documentInFront(session);
-  return act(session, "action", text, [move](Automate& a) { return (static_cast<Sdocum&>(a).*move)(); });
+  return act(session, "action", text, text, [move](Automate& a) { return (static_cast<Sdocum&>(a).*move)(); });
 }
 
 }  // namespace
@@ -126,7 +129,7 @@ bool ouvrir(Session& session, const std::string& name) {
 }
 
 void fermer(Session& session) {
-  act(session, "action", "fermer", [](Automate& a) {
+  act(session, "action", "fermer", "", [](Automate& a) {
     a.sortir(nullptr, 0);
     return true;
   });
@@ -134,7 +137,7 @@ void fermer(Session& session) {
 
 bool saisir(Session& session, const std::string& object, const std::string& text) {
   Target target = resolve(ecranDevant(session), object);
-  return act(session, "saisie", object + " = " + text, [&](Automate& a) {
+  return act(session, "saisie", object + " = " + text, object, [&](Automate& a) {
     auto* document = dynamic_cast<Sdocum*>(&a);
     auto* saisie = dynamic_cast<Saisie*>(&a);
     if (a.ecran()->estInterdit(object) || a.ecran()->estCache(object)) return false;
@@ -167,13 +170,13 @@ bool saisir(Session& session, const std::string& object, const std::string& text
 bool appuyer(Session& session, const std::string& action) {
   Automate& screen = ecranDevant(session);
   if (!screen.aBranche(action)) throw HostError("action « " + action + " » inconnue de l'écran « " + screen.code() + " »");
-  return act(session, "action", action, [&](Automate& a) { return step(a, action) != Outcome::refused; });
+  return act(session, "action", action, action, [&](Automate& a) { return step(a, action) != Outcome::refused; });
 }
 
 bool ouvrirChoix(Session& session, const std::string& object) {
   Target target = resolve(ecranDevant(session), object);
   const char* event = target.listColumn ? "CTRL_OUVRE" : "CTRL_CHOISIR";
-  return act(session, "action", std::string("choix ") + object, [&](Automate& a) {
+  return act(session, "action", "choix " + object, object, [&](Automate& a) {
     host::Chaine control(object);
     host::EvtParamRef about(1, &control);
     return step(a, event, &about) != Outcome::refused;
@@ -189,7 +192,7 @@ bool allerLigne(Session& session, int n) {
   Sdocum& document = documentInFront(session);
   if (n < 1 || n > static_cast<int>(document.rows().size()))
     throw HostError("la liste « " + document.listName() + " » n'a pas de ligne " + std::to_string(n));
-  return act(session, "action", "ligne " + std::to_string(n),
+  return act(session, "action", "ligne " + std::to_string(n), "",
              [n](Automate& a) { return static_cast<Sdocum&>(a).goToLine(n); });
 }
 
@@ -205,7 +208,7 @@ bool choisirLigne(Session& session, int n) {
   if (!list) throw HostError("l'écran « " + ecranDevant(session).code() + " » n'a pas de liste d'accès");
   if (n < 1 || n > static_cast<int>(list->rows().size()))
     throw HostError("la liste n'a pas de ligne " + std::to_string(n));
-  return act(session, "action", "choisir la ligne " + std::to_string(n), [n](Automate& a) {
+  return act(session, "action", "choisir la ligne " + std::to_string(n), "", [n](Automate& a) {
     static_cast<Scritere&>(a).selectRow(n);
     return true;
   });

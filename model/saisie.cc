@@ -84,9 +84,16 @@ void Saisie::ctrl_actualiser_mode(Evt*) {}
 
 std::string Saisie::identifiantDocument() { return table(false)->valeur("IDENT").chaine(); }
 
-void Saisie::enterMode(char m) {
+void Saisie::enterMode(char m, bool announce) {
   mode_ = m;
-  step(*this, modeStartEvent(m));
+  if (announce) step(*this, modeStartEvent(m));
+}
+
+void Saisie::makeNew(Table& t) {
+  std::vector<std::pair<std::string, Valeur>> values;
+  for (const Colonne& c : t.colonnes()) values.emplace_back(c.name, t.valeur(c.name));
+  t.raz();
+  for (const auto& [name, value] : values) t.affecter(name, value);
 }
 
 void Saisie::applyVisuRequest() {
@@ -157,10 +164,7 @@ void Saisie::validation(Evt*) {
   if (mode_ == 'C') {
     // Made a new record again: an earlier attempt that was undone must not turn
     // this insert into an update of a row that no longer exists.
-    std::vector<std::pair<std::string, Valeur>> values;
-    for (const Colonne& c : header.colonnes()) values.emplace_back(c.name, header.valeur(c.name));
-    header.raz();
-    for (const auto& [name, value] : values) header.affecter(name, value);
+    makeNew(header);
     ident = prochainIdentifiant(session().base(), nomTable(), kIdentWidth);
     header.affecter("IDENT", Valeur::texte(ident));
   } else {

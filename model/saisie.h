@@ -124,8 +124,10 @@ class Saisie : public AutomTab {
   void applyVisuRequest();
 
  protected:
-  // Switches to mode `m` and runs its start event.
-  void enterMode(char m);
+  // Switches to mode `m` and, when `announce`, runs its start event.
+  void enterMode(char m, bool announce = true);
+  // Makes `t`'s buffer a new record that keeps its values: its next ecrit() inserts.
+  static void makeNew(Table& t);
   // Reads the document `ident` (SELECTION_TRI included); false when it is not shown.
   bool openDocument(const std::string& ident);
   // Ends a line entry before the document is saved; false when the line was
