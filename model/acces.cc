@@ -17,7 +17,12 @@ Scritere::Scritere(Evt* e) : Traitecr(e) {
   addBaseBranch("ACTIVE_REQUETE", [this](Evt* ev) { active_requete(ev); });
 }
 
-void Scritere::active_requete(Evt*) { out_of_date_ = true; }
+void Scritere::active_requete(Evt*) {
+  // Every row until the handler says otherwise.
+  table(false)->initRequete();
+  table(false)->activeRequete();
+  out_of_date_ = true;
+}
 
 bool Scritere::startSteps() {
   return step(*this, "INIT") == Outcome::accepted && step(*this, "DEBUT") == Outcome::accepted;

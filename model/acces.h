@@ -34,8 +34,8 @@ class Scritere : public Traitecr {
  public:
   explicit Scritere(Evt* e);
 
-  // "ACTIVE_REQUETE": the base marks the list out of date. A handler calls it
-  // first, then sets the request of the main table.
+  // "ACTIVE_REQUETE": the base asks for every row of the main table and marks the
+  // list out of date. A handler calls it first, then sets its own request.
   virtual void active_requete(Evt* e);
 
   // Refills the list if it is out of date (see above). The start cycle and every

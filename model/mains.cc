@@ -170,7 +170,11 @@ bool saisir(Session& session, const std::string& object, const std::string& text
 bool appuyer(Session& session, const std::string& action) {
   Automate& screen = ecranDevant(session);
   if (!screen.aBranche(action)) throw HostError("action « " + action + " » inconnue de l'écran « " + screen.code() + " »");
-  return act(session, "action", action, action, [&](Automate& a) { return step(a, action) != Outcome::refused; });
+  return act(session, "action", action, action, [&](Automate& a) {
+    // A button the screen disabled or hid cannot be pressed.
+    if (a.ecran()->estInterdit(action) || a.ecran()->estCache(action)) return false;
+    return step(a, action) != Outcome::refused;
+  });
 }
 
 bool ouvrirChoix(Session& session, const std::string& object) {

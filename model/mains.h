@@ -44,6 +44,7 @@ void fermer(host::Session& session);
 // visualisation, or when the branch rejects the input.
 bool saisir(host::Session& session, const std::string& object, const std::string& text);
 // Presses an action: runs the branch of that name ("GERER", "B_VALID_DOC").
+// Refused when the screen disabled or hid it.
 bool appuyer(host::Session& session, const std::string& action);
 // Asks for the choice window of a control: "CTRL_OUVRE" for a list column,
 // "CTRL_CHOISIR" otherwise, with the control's name.

@@ -32,8 +32,8 @@ struct ListeTest : model::Acces2 {
     addBranch("DEBUT", &ListeTest::pas);
     addBranch("ACTIVE_REQUETE", &ListeTest::active_requete);
     addBranch("LST_SELECTION", &ListeTest::lst_selection);
-    addBranch("LST_LISTE_VIDE", &ListeTest::pas);
-    addBranch("LST_LISTE_PLEINE", &ListeTest::pas);
+    addBranch("LST_LISTE_VIDE", &ListeTest::lst_liste_vide);
+    addBranch("LST_LISTE_PLEINE", &ListeTest::lst_liste_pleine);
     addBranch("VFILTRE", &ListeTest::vfiltre);
     addBranch("GERER", &ListeTest::gerer);
     addBranch("PLUS_TARD", &ListeTest::pas);
@@ -58,6 +58,14 @@ struct ListeTest : model::Acces2 {
       return;
     }
     VLIBCP2 = "Compte " + NUMCP.chaine();
+  }
+  void lst_liste_vide(Evt* e) {
+    journal.push_back(e->nom());
+    ecran()->interdit("GERER", "");
+  }
+  void lst_liste_pleine(Evt* e) {
+    journal.push_back(e->nom());
+    ecran()->autorise("GERER", "");
   }
   void vfiltre(Evt*) { appelerProcedure("", "", "", "ACTIVE_REQUETE", nullptr, 0); }
   void gerer(Evt* e) {
@@ -128,6 +136,9 @@ TEST_F(AccesTest, RejectedRowsAreDroppedAndAnEmptyListSaysSo) {
   EXPECT_TRUE(idents().empty());
   EXPECT_EQ(journal.back(), "LST_LISTE_VIDE");
   EXPECT_EQ(session().transcript().textes("saisie").back(), "VFILTRE = 411001");
+  EXPECT_FALSE(model::appuyer(session(), "GERER"));
+  EXPECT_EQ(journal.back(), "LST_LISTE_VIDE");
+  EXPECT_EQ(session().transcript().textes("refus"), std::vector<std::string>{"GERER"});
 }
 
 TEST_F(AccesTest, AHandlerLeavingAtDebutStopsTheStart) {

@@ -67,6 +67,7 @@ struct DocumentTest : model::Gestion_document2 {
     addBranch("VALIDATION_DONNEES", &DocumentTest::donnees);
     addBranch("SUPPRESSION_DONNEES", &DocumentTest::donnees);
     addBranch("IMPORTER", &DocumentTest::importer);
+    addBranch("SOLDER", &DocumentTest::solder);
   }
 
   void trace(Evt* e) { journal.push_back(e->nom()); }
@@ -125,6 +126,14 @@ struct DocumentTest : model::Gestion_document2 {
     journal.push_back(e->nom() + " " + L_NUMERO.chaine() + " " + L_NUMCP.chaine());
     if (e->nom() == "VALIDATION_DONNEES" && L_NUMERO == consignes.casserDonneesSur)
       throw HostError("panne voulue");
+  }
+  // A button that changes the current line, as a balance button does.
+  void solder(Evt* e) {
+    EvtParamRef list(1, "LST");
+    appelerProcedure("", "", "", "CTRL_DEBUT_MODIF_LISTE", &list, 0);
+    if (refuse()) return;
+    L_HT = 99;
+    ecran()->fonction(20, "LST");
   }
   // Fills the lines as an entry model would: three lines added, the middle one
   // removed from the image, the rest numbered again.
@@ -363,6 +372,20 @@ TEST_F(DocumentCycleTest, AbandoningALineDropsItAndKeepsTheOthers) {
   model::abandonnerLigne(session());
   EXPECT_EQ(model::lignes(session()).size(), 2u);
   EXPECT_FALSE(document().lineInEntry());
+}
+
+TEST_F(DocumentCycleTest, AHandlerPutsTheCurrentLineIntoModification) {
+  documentEnregistre();
+  ouvrirDocument("D1", "VMCAm");
+  model::allerLigne(session(), 2);
+  EXPECT_FALSE(document().lineInEntry());
+  ASSERT_TRUE(model::appuyer(session(), "SOLDER"));
+  EXPECT_TRUE(document().lineInEntry());
+  ASSERT_TRUE(model::validerLigne(session()));
+  EXPECT_EQ(model::lignes(session()).at(1).at("HT"), "99.00");
+  EXPECT_EQ(model::ecranDevant(session()).ecran()->fonctions().back(), std::make_pair(20, std::string("LST")));
+  ASSERT_TRUE(model::appuyer(session(), "VALID_DOC"));
+  EXPECT_EQ(lignesDe("D1"), "D1|000001 706100 10.00, D1|000002 706200 99.00");
 }
 
 TEST_F(DocumentCycleTest, AddedLinesAreNumberedAgainInTheirOrder) {
