@@ -25,6 +25,7 @@
 namespace host {
 
 class Automate;
+class Devises;
 class Session;
 
 // What the user saw and did, in order. Kinds: "ouvre", "ferme", "message",
@@ -145,6 +146,9 @@ class Session {
   // ---- work tables: the session's private copy, made on first use
   void tableDeTravail(const std::string& name);
 
+  // The currency service of the session (host/currency.h); host::euro() makes it.
+  std::shared_ptr<Devises>& devises() { return devises_; }
+
  private:
   struct Queued {
     Automate* automate;
@@ -164,6 +168,7 @@ class Session {
   int action_depth_ = 0;
   bool failed_ = false;
   Session* previous_;
+  std::shared_ptr<Devises> devises_;
 };
 
 }  // namespace host
