@@ -61,6 +61,16 @@ const Declaration* Registre::module(std::string_view name) const {
   return nullptr;
 }
 
+Fabrique Registre::substituer(std::string_view name, Fabrique fabrique) {
+  for (auto& d : declarations_)
+    if (d.sorte == Declaration::kModule && d.name == name) {
+      Fabrique previous = d.fabrique;
+      d.fabrique = fabrique;
+      return previous;
+    }
+  throw HostError("module « " + std::string(name) + " » inconnu");
+}
+
 AutomatePtr Registre::creer(std::string_view name, Evt* lancement) const {
   const Declaration* d = module(name);
   if (!d) throw HostError("module « " + std::string(name) + " » inconnu");

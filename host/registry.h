@@ -69,8 +69,9 @@ class Registre {
   // "GESTION1") is "MIRVAE-GESTION1"; a library "$$" stands for the base's own.
   static std::string nomModule(std::string_view base, std::string_view source, std::string_view module);
 
-  // Forgets every declaration (tests that load a library of their own).
-  void vider() { declarations_.clear(); }
+  // Puts another factory behind a registered name and returns the one it had
+  // (tests stand a double in for a module, then put the real one back).
+  Fabrique substituer(std::string_view name, Fabrique fabrique);
 
  private:
   std::vector<Declaration> declarations_;

@@ -1,7 +1,12 @@
 #include "registry/library.h"
 
+#include "access/acces.h"
+#include "entry/gestion1.h"
 #include "host/registry.h"
 #include "host/value.h"
+#include "posting/creer_piece_fc.h"
+#include "posting/supprimer_piece.h"
+#include "posting/verifier_modif_piece.h"
 #include "services/services.h"
 
 namespace registry {

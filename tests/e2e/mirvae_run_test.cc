@@ -1,0 +1,124 @@
+// The `mirvae` program itself, run as a person runs it: session scripts through
+// `mirvae run` on a fresh demo dossier, the demo, and --help on every command.
+#include <gtest/gtest.h>
+#include <sys/wait.h>
+
+#include <cstdio>
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+
+#include "tests/support/fixture.h"
+
+namespace {
+
+struct Outcome {
+  int status;
+  std::string out;  // standard output and error together
+};
+
+Outcome mirvae(const std::string& args) {
+  std::string command = std::string("'") + MIRVAE_BINARY + "' " + args + " 2>&1";
+  FILE* pipe = ::popen(command.c_str(), "r");
+  if (!pipe) return {-1, "popen"};
+  std::string out;
+  char buffer[4096];
+  for (std::size_t n; (n = std::fread(buffer, 1, sizeof buffer, pipe)) > 0;) out.append(buffer, n);
+  int status = ::pclose(pipe);
+  return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, out};
+}
+
+std::string quote(const std::string& path) { return "'" + path + "'"; }
+
+class MirvaeRunTest : public ::testing::Test {
+ protected:
+  void SetUp() override {
+    dossier_ = testing_support::cheminTemporaire("mirvae-run");
+    script_ = testing_support::cheminTemporaire("mirvae-script") + ".txt";
+    Outcome init = mirvae("init --demo " + quote(dossier_));
+    ASSERT_EQ(init.status, 0) << init.out;
+  }
+  void TearDown() override {
+    for (const auto& path : {dossier_, script_, other_})
+      for (const char* suffix : {"", "-wal", "-shm"}) std::filesystem::remove(path + suffix);
+  }
+  Outcome play(const std::string& text) {
+    std::ofstream(script_) << text;
+    return mirvae("run " + quote(dossier_) + " " + quote(script_));
+  }
+  bool registered(const std::string& module) {
+    std::istringstream names(mirvae("modules").out);
+    for (std::string name; std::getline(names, name);)
+      if (name == module) return true;
+    return false;
+  }
+
+  std::string dossier_, script_, other_;
+};
+
+TEST_F(MirvaeRunTest, PlaysASessionOnAFreshDemoDossierEndToEnd) {
+  // The client-invoice list when the library has it; the dossier's own data always.
+  std::string screen = registered("MIRVAE-ACCES1") ? "open MIRVAE-ACCES1\n"
+                                                     "expect screen MIRVAE-ACCES1\n"
+                                                     "expect no error\n"
+                                                     "close\n"
+                                                   : "";
+  Outcome run = play("# une session\ntoday 15/03/2024 10:30\n" + screen +
+                 "expect sql \"SELECT count(*) FROM COMPT WHERE NUMCP LIKE '512%'\" = 2\n"
+                 "expect sql \"SELECT count(*) FROM PIECE\" = 0\n");
+  EXPECT_EQ(run.status, 0) << run.out;
+  if (!screen.empty()) {
+    EXPECT_NE(run.out.find("[ouvre] MIRVAE-ACCES1"), std::string::npos) << run.out;
+    EXPECT_NE(run.out.find("[ferme] MIRVAE-ACCES1"), std::string::npos) << run.out;
+  }
+}
+
+TEST_F(MirvaeRunTest, AFailingExpectationExitsNonZeroNamingItsLine) {
+  Outcome run = play("today 15/03/2024\n\nexpect sql \"SELECT count(*) FROM COMPT WHERE NUMCP LIKE '512%'\" = 3\n"
+                 "expect sql \"SELECT 1\" = 1\n");
+  EXPECT_EQ(run.status, 1) << run.out;
+  EXPECT_NE(run.out.find(script_ + ":3: expect sql"), std::string::npos) << run.out;
+  EXPECT_NE(run.out.find("la requête donne « 2 », attendu « 3 »"), std::string::npos) << run.out;
+}
+
+TEST_F(MirvaeRunTest, ALineThatCannotBeUnderstoodExitsNonZeroNamingItsLine) {
+  Outcome run = play("today 15/03/2024\nappuyer VALIDER\n");
+  EXPECT_EQ(run.status, 1) << run.out;
+  EXPECT_NE(run.out.find(script_ + ":2: appuyer VALIDER : instruction inconnue"), std::string::npos) << run.out;
+}
+
+TEST_F(MirvaeRunTest, AMissingScriptOrDossierIsRefused) {
+  EXPECT_NE(mirvae("run " + quote(dossier_) + " /nonexistent/script.txt").status, 0);
+  std::ofstream(script_) << "today 15/03/2024\n";
+  EXPECT_NE(mirvae("run /nonexistent/dossier.db " + quote(script_)).status, 0);
+}
+
+TEST_F(MirvaeRunTest, HelpWorksOnEveryCommand) {
+  for (const char* command : {"", "init", "modules", "run", "demo", "ledger", "export"}) {
+    Outcome help = mirvae(std::string(command) + " --help");
+    EXPECT_EQ(help.status, 0) << command << "\n" << help.out;
+    EXPECT_NE(help.out.find("--help"), std::string::npos) << command << "\n" << help.out;
+  }
+}
+
+TEST_F(MirvaeRunTest, TheDemoMakesItsDossierAndNeverReplacesAnotherFile) {
+  other_ = testing_support::cheminTemporaire("mirvae-demo");
+  Outcome demo = mirvae("demo --dossier " + quote(other_));
+  EXPECT_NE(demo.out.find("Le dossier de démonstration est "), std::string::npos) << demo.out;
+  EXPECT_TRUE(std::filesystem::exists(other_));
+  // Played again, it starts from a fresh dossier: same result.
+  Outcome again = mirvae("demo --dossier " + quote(other_));
+  EXPECT_EQ(again.status, demo.status) << again.out;
+
+  std::filesystem::remove(other_);
+  std::ofstream(other_) << "mes notes\n";
+  Outcome refused = mirvae("demo --dossier " + quote(other_));
+  EXPECT_NE(refused.status, 0);
+  EXPECT_NE(refused.out.find("n'est pas un dossier"), std::string::npos) << refused.out;
+  std::ifstream kept(other_);
+  std::string text;
+  std::getline(kept, text);
+  EXPECT_EQ(text, "mes notes");
+}
+
+}  // namespace
