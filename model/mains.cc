@@ -121,11 +121,14 @@ Automate& ecranDevant(Session& session) {
 
 bool ouvrir(Session& session, const std::string& name) {
   if (!host::Registre::instance().module(name)) throw HostError("module « " + name + " » inconnu");
-  return session.action([&] {
+  const std::size_t before = session.ecrans().size();
+  bool ok = session.action([&] {
     session.ouvrir(host::Registre::instance().creer(name, nullptr));
     session.executerFile();
     if (Automate* front = session.ecranCourant()) catchUp(*front);
   });
+  // A screen that left during its start is closed already.
+  return ok && session.ecrans().size() > before;
 }
 
 void fermer(Session& session) {
