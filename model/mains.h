@@ -33,7 +33,8 @@ namespace model {
 host::Automate& ecranDevant(host::Session& session);
 
 // Opens module `name` (registry name) as a user would from a menu; false when its
-// start failed (it is then closed). A screen that left at once is not in front.
+// start failed (it is then closed) or when a screen left at once. A process runs
+// to its end.
 bool ouvrir(host::Session& session, const std::string& name);
 // Closes the screen in front.
 void fermer(host::Session& session);

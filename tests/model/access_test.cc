@@ -143,7 +143,7 @@ TEST_F(AccesTest, RejectedRowsAreDroppedAndAnEmptyListSaysSo) {
 
 TEST_F(AccesTest, AHandlerLeavingAtDebutStopsTheStart) {
   quitAt = "DEBUT";
-  model::ouvrir(session(), "TEST-MODELE_ACCES");
+  EXPECT_FALSE(model::ouvrir(session(), "TEST-MODELE_ACCES"));
   EXPECT_EQ(journal, (std::vector<std::string>{"INIT", "AVANT_DEBUT", "DEBUT"}));
   EXPECT_EQ(session().ecranCourant(), nullptr);
   EXPECT_EQ(session().transcript().textes("ferme"), std::vector<std::string>{"TEST-MODELE_ACCES"});
