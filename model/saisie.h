@@ -21,13 +21,15 @@
 //     "DEBUT_MODIFICATION"); "v" runs "DEBUT_VISUALISATION".
 //   - otherwise "CREATION": blank header, no lines, "DEBUT_CREATION",
 //     "DEBUT_FICHE", "APRES_DEBUT_CREATION".
-// Whenever a handler asks for visualisation (Ecran::toVisu), the document switches
-// to it at the end of that step ("DEBUT_VISUALISATION").
+// When a handler asks for visualisation (Ecran::toVisu) of a document in
+// modification, the document switches to it ("DEBUT_VISUALISATION") once the start
+// or the user action is over.
 //
 // Validation ("VALID_DOC", base Setape::valid_doc): a line still in entry is
 // validated first; then "VALIDATION". Its base (Saisie::validation), which a
 // handler calls once its checks passed, saves: the header (a new one gets its
-// IDENT from the counter "MIRVAE" of NDOC, 8 characters), then the lines (see
+// IDENT, 8 characters, from the NDOC counter named after the main table,
+// "MIRVAE"), then the lines (see
 // Sdocum). A refusal before the base saves nothing. Once saved: "APRES_VALIDATION",
 // and the lines are read again as saved. For a creation then "FIN_CREATION" and
 // "DIALOGUE" with TYPE "VA_CREAT", which asks whether to go on creating: REPONSE 1
