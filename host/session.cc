@@ -10,13 +10,14 @@ namespace host {
 namespace {
 thread_local Session* current = nullptr;
 
-bool isWorkTableName(const std::string& name) {
+}  // namespace
+
+bool estTableDeTravail(const std::string& name) {
   auto endsWith = [&](const std::string& suffix) {
     return name.size() >= suffix.size() && name.compare(name.size() - suffix.size(), suffix.size(), suffix) == 0;
   };
-  return endsWith("_M01") || endsWith("_M02") || name == "MEM02" || name == "MEM04";
+  return endsWith("_M01") || endsWith("_M02") || name == "MEM02" || name == "MEM04" || name.rfind("I_", 0) == 0;
 }
-}  // namespace
 
 // ---------------------------------------------------------------------------- Transcript
 
@@ -86,7 +87,7 @@ Session::Session(std::unique_ptr<Database> db, UserAgent& agent, std::string use
   while (s.step()) names.push_back(s.text(0));
   s.reset();
   for (const auto& name : names)
-    if (isWorkTableName(name)) {
+    if (estTableDeTravail(name)) {
       db_->creerCopiePrivee(name, name);
       work_tables_.insert(name);
     }

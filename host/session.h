@@ -26,6 +26,10 @@ namespace host {
 
 class Automate;
 class Devises;
+
+// Work tables belong to the user's session: names ending in "_M01" or "_M02",
+// "MEM02", "MEM04", and the "I_" tables that reading procedures fill.
+bool estTableDeTravail(const std::string& name);
 class Session;
 
 // What the user saw and did, in order. Kinds: "ouvre", "ferme", "message",

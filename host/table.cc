@@ -14,14 +14,6 @@ namespace {
 // last Unicode character.
 const char kAfterAll[] = "\xF4\x8F\xBF\xBF";
 
-bool isWorkTable(const std::string& name) {
-  auto endsWith = [&](const char* suffix) {
-    std::string s(suffix);
-    return name.size() >= s.size() && name.compare(name.size() - s.size(), s.size(), s) == 0;
-  };
-  return endsWith("_M01") || endsWith("_M02") || name == "MEM02" || name == "MEM04";
-}
-
 long long memoryImageCounter = 0;
 
 // Memory images open in this process: (owner, image name) -> physical table and
@@ -82,7 +74,7 @@ void Table::open() {
     private_copy_ = true;
   } else {
     physical_ = name_;
-    if (isWorkTable(name_)) session.tableDeTravail(name_);
+    if (estTableDeTravail(name_)) session.tableDeTravail(name_);
   }
   columns_ = &db_->colonnes(physical_);
   buffer_.clear();
