@@ -26,7 +26,7 @@ constexpr const char* kOptions[] = {"OPT_TVA",    "OPT_TVA1",   "OPT_QTE",    "O
 constexpr int kOptionCount = sizeof kOptions / sizeof kOptions[0];
 
 std::string yearMonth(const year_month_day& day) {
-  char buffer[8];
+  char buffer[16];  // room for any year the calendar types allow
   std::snprintf(buffer, sizeof buffer, "%04d%02u", int(day.year()), unsigned(day.month()));
   return buffer;
 }
