@@ -22,6 +22,15 @@ host::Chaine* crashFlag = nullptr;
 
 void declarerUnites() {
   // Units are added here in load order as their modules are built.
+
+  // Unit CREER_PIECE_FC, GESTION1, SUPPRIMER_PIECE, VERIFIER_MODIF_PIECE.
+  static const Global postingGlobal("MIRVAE", "MIRVAE");
+  static const Module creerPieceFc("", "MIRVAE-CREER_PIECE_FC", &host::fabriquer<MIRVAECreer_piece_fc>, false, "");
+  // "MIRVAE-GESTION1" goes here.
+  static const Module supprimerPiece("", "MIRVAE-SUPPRIMER_PIECE", &host::fabriquer<MIRVAESupprimer_piece>, false, "");
+  static const Module verifierModifPiece("", "MIRVAE-VERIFIER_MODIF_PIECE",
+                                         &host::fabriquer<MIRVAEVerifier_modif_piece>, false, "");
+  static const Source postingSource("MIRVAE", nullptr);
 }
 
 }  // namespace
