@@ -26,7 +26,7 @@ void declarerUnites() {
   // Unit CREER_PIECE_FC, GESTION1, SUPPRIMER_PIECE, VERIFIER_MODIF_PIECE.
   static const Global postingGlobal("MIRVAE", "MIRVAE");
   static const Module creerPieceFc("", "MIRVAE-CREER_PIECE_FC", &host::fabriquer<MIRVAECreer_piece_fc>, false, "");
-  // "MIRVAE-GESTION1" goes here.
+  static const Module gestion1("", "MIRVAE-GESTION1", &host::fabriquer<MIRVAEGestion1>, false, "");
   static const Module supprimerPiece("", "MIRVAE-SUPPRIMER_PIECE", &host::fabriquer<MIRVAESupprimer_piece>, false, "");
   static const Module verifierModifPiece("", "MIRVAE-VERIFIER_MODIF_PIECE",
                                          &host::fabriquer<MIRVAEVerifier_modif_piece>, false, "");

@@ -1,0 +1,117 @@
+// The checks of the header and of the document as a whole, and the account check
+// shared by the header and the lines. A failed check shows its message, puts the
+// focus on the faulty control, refuses its event and leaves the method result at 1.
+#include "entry/gestion.h"
+
+namespace entry {
+
+void EntryScreen::dtope(Evt* e) {
+  if (!MIRVAE_DTOPE.estVide() && MIRVAE_DTOPE < PARAM_PDDEX) return refuser(e, libelle("0134"), "");
+  if (!MIRVAE_DTOPE.estVide() && MIRVAE_DTOPE > PARAM_PDTCL) return refuser(e, libelle("0135"), "");
+  // The due date follows the operation date.
+  MIRVAE_DTECH = MIRVAE_DTOPE;
+  ecran()->affiche("DTECH", "");
+}
+
+void EntryScreen::vlibcp1(Evt* e) {
+  if (VLIBCP1.estVide()) {
+    MIRVAE_NUMCP = "";
+    ecran()->affiche("VLIBCP1", "");
+    return;
+  }
+  if (COMPT1.lit(3, COMPT1_LIBCP, '=', VLIBCP1) != 0) return refuser(e, kind_.headerMissing, "VLIBCP1");
+  EvtParamVal controle(3, "LIBCP", &VLIBCP1, kind_.headerNature);
+  procedure("CONTROLER_COMPT", &controle);
+  if (erreurMethode() != 0) {
+    controler("VLIBCP1");
+    rejeter(e);
+    return;
+  }
+  MIRVAE_NUMCP = COMPT_NUMCP;
+}
+
+void EntryScreen::compt1_choisir(Evt*) {
+  if (enVisualisation()) {
+    messageOk("Opération interdite en mode visualisation !");
+    return;
+  }
+  EvtParamRef choix(5, &VLIBCP1, &COMPT1_LIBCP, kind_.headerNature, "LIBCP", "N");
+  appelerProcedure("*", "CPCOMPT", "INTERFACE", "CHOIX_INTITULE_REDUIT", &choix, -1);
+  enFile("VLIBCP1");
+}
+
+void EntryScreen::controler_compt(Evt* e) {
+  Chaine P_1("P_1", "", "", 4, this), P_2("P_2", "", "", 4, this), P_3("P_3", "", "", 4, this);
+  e->param(0, P_1, 0);
+  e->param(1, P_2, 0);
+  e->param(2, P_3, 0);
+  erreurMethode(0, e);
+  if (P_2.estVide()) return;
+
+  Chaine V_CNATC("V_CNATC", "", "", 4, this), V_INATC("V_INATC", "", "", 4, this);
+  Chaine V_MESSAGE("V_MESSAGE", "", "", 4, this);
+  V_CNATC = P_3;
+  EvtParamRef nature(2, &V_CNATC, &V_INATC);
+  compta("LIBELLE_NATURE_COMPTE", &nature);
+  V_MESSAGE = "Le compte est inexistant !";
+
+  Champ colonne(P_1.chaine().c_str(), &COMPT);
+  if (COMPT.lit(3, colonne, '=', P_2) != 0) {
+    messageOk(V_MESSAGE.chaine());
+    erreurMethode(1, e);
+    return;
+  }
+  // The account again, among those a list of this nature offers: an account left
+  // out of the lists (CCTRA "O") reads blank and fails the nature test below.
+  COMPT.initRequete();
+  if (!V_CNATC.estVide()) COMPT.ajouteFiltre(COMPT_NATUC, '?', V_CNATC);
+  COMPT.ajouteFiltre(COMPT_CCTRA, '#', "O");
+  COMPT.ajouteFiltre(colonne, '=', P_2);
+  COMPT.choisitIndex(P_1.chaine().c_str());
+  COMPT.activeRequete();
+  if (COMPT.suivant(3) != 0) COMPT.raz();
+
+  V_MESSAGE = "";
+  if (COMPT_NATUC.position(V_CNATC.chaine()) == 0)
+    V_MESSAGE = "Le compte n'est pas de nature <" + V_INATC.chaine() + "> !";
+  if (!V_MESSAGE.estVide()) {
+    messageOk(V_MESSAGE.chaine());
+    erreurMethode(1, e);
+  }
+}
+
+void EntryScreen::p1_sortie(Evt*) {}
+
+void EntryScreen::grp1_sortie(Evt*) {
+  procedure("CONTROLER_P1");
+  if (erreurMethode() != 0) return;
+  procedure("CONTROLER_GRP1");
+}
+
+void EntryScreen::controler_p1(Evt* e) {
+  erreurMethode(1, e);
+  if (MIRVAE_DTOPE.estVide()) return refuser(e, "La saisie d'une date d'opération est obligatoire !", "DTOPE");
+  lireJournal();
+  // Year-months compare as text: "YYYYMM".
+  if (anneeMois() <= JONAL_CLOAM.chaine())
+    return refuser(e, "Le journal <" + JONAL_NUMJL.chaine() + "> est clos pour cette date !", "DTOPE");
+  if (MIRVAE_NPIEC.estVide()) return refuser(e, "La saisie d'un numéro de pièce est obligatoire !", "NPIEC");
+  erreurMethode(0, e);
+}
+
+void EntryScreen::controler_grp1(Evt* e) {
+  erreurMethode(1, e);
+  if (MIRVAE_NUMCP.estVide()) return refuser(e, kind_.headerRequired, "VLIBCP1");
+  if (MIRVAE_INPIE.estVide()) return refuser(e, "La saisie d'un libellé de pièce est obligatoire !", "INPIE");
+  erreurMethode(0, e);
+}
+
+void EntryScreen::controler_lst(Evt* e) {
+  erreurMethode(1, e);
+  MEM_MIRVAL.initRequete();
+  if (MEM_MIRVAL.nombre() == 0) return refuser(e, "Aucune ligne n'a été saisie.@La validation est impossible !", "");
+  if (V_TOT_HT == 0) return refuser(e, "La saisie d'une pièce dont le total est nul n'est pas autorisée !", "");
+  erreurMethode(0, e);
+}
+
+}  // namespace entry
