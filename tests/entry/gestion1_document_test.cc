@@ -1,0 +1,192 @@
+// The client invoice screen as a document: its registration, creation, the
+// validation dialog and the posting after saving, the guards on modification and
+// deletion, and the record information.
+#include <algorithm>
+
+#include <gtest/gtest.h>
+
+#include "host/registry.h"
+#include "tests/entry/gestion1_fixture.h"
+
+namespace {
+
+using testing_support::Gestion1Test;
+
+class DocumentTest : public Gestion1Test {
+ protected:
+  // A client invoice of two lines, 100 at 20 % and 50 without VAT.
+  bool facture() { return creer() && client() && ligne("708500", "100") && ligne("758000", "50"); }
+  std::string mode() { return ecran().modeCourant(); }
+};
+
+TEST_F(DocumentTest, RegisteredInThePostingUnitWithItsBranchTable) {
+  std::vector<std::string> modules = host::Registre::instance().modules();
+  auto at = std::find(modules.begin(), modules.end(), "MIRVAE-GESTION1");
+  ASSERT_NE(at, modules.end());
+  ASSERT_NE(at, modules.begin());
+  EXPECT_EQ(*(at - 1), "MIRVAE-CREER_PIECE_FC");
+  ASSERT_NE(at + 1, modules.end());
+  EXPECT_EQ(*(at + 1), "MIRVAE-SUPPRIMER_PIECE");
+
+  // Without launch parameters the screen starts a creation.
+  ASSERT_TRUE(creer());
+  ASSERT_NE(dynamic_cast<MIRVAEGestion1*>(&ecran()), nullptr);
+  EXPECT_EQ(mode(), "C");
+  EXPECT_EQ(valeur("PIDENT"), "");
+  const std::vector<std::string>& branches = ecran().branches();
+  EXPECT_EQ(branches.size(), 91u);
+  EXPECT_EQ(branches.front(), "INIT");
+  EXPECT_EQ(branches[3], "CTRL_CACHE_COLONNE ");
+  EXPECT_EQ(branches.back(), "MAJ_LIGNES_MEMOIRE");
+  EXPECT_EQ(ecran().ecran()->commandeLibelle(1), "Infos fiche");
+  EXPECT_TRUE(appuyer("CTRL_CACHE_COLONNE "));
+  EXPECT_EQ(dernierMessage(), "Cette liste n'est pas personnalisable.");
+}
+
+TEST_F(DocumentTest, CreationProposesTodayUnlessItIsPastTheClosingDate) {
+  const struct {
+    const char* closing;
+    const char* dtope;
+  } cases[] = {{"2024-03-14", ""}, {"2024-03-15", "15/03/2024"}, {"2024-12-31", "15/03/2024"}};
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.closing);
+    sql(std::string("UPDATE PARAM SET PDTCL = '") + c.closing + "'");
+    ASSERT_TRUE(creer());
+    EXPECT_EQ(valeur("MIRVAE.DTOPE"), c.dtope);
+    EXPECT_EQ(valeur("MIRVAE.DTECH"), c.dtope);
+    EXPECT_EQ(valeur("MIRVAE.TYPE"), "FC");
+    EXPECT_EQ(valeur("MIRVAE.NUMJL"), "VT");
+    EXPECT_EQ(valeur("MIRVAE.MONNAIE_IDENT"), "EUR");
+    EXPECT_EQ(valeur("MIRVAE.SAISIE_MTT"), "1");
+    model::fermer(session());
+  }
+}
+
+TEST_F(DocumentTest, AbandoningTheDialogSavesNothing) {
+  ASSERT_TRUE(facture());
+  enregistrer("0");
+  EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE"), 0);
+  EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAL"), 0);
+  EXPECT_EQ(mode(), "C");
+  EXPECT_EQ(model::lignes(session()).size(), 2u);
+}
+
+TEST_F(DocumentTest, SavingWritesTheOperationAndPostsIt) {
+  ASSERT_TRUE(facture());
+  enregistrer("1");
+  ASSERT_EQ(nombre("SELECT count(*) FROM MIRVAE"), 1);
+  EXPECT_EQ(sql("SELECT TYPE || ' ' || NUMCP || ' ' || NPIEC || ' ' || INPIE FROM MIRVAE"),
+            "FC 411001 VT1 Facture client n° VT1");
+  EXPECT_EQ(sql("SELECT HT || ' ' || TVA || ' ' || TTC FROM MIRVAE"), "150 20 170");
+  EXPECT_EQ(sql("SELECT DATEC || ' ' || HEUREC || ' ' || USERM FROM MIRVAE"), "2024-03-15 10:30:00 testeur");
+  EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAL WHERE length(IDENT) = 8 AND HT + TVA = TTC"), 2);
+  // Posted: the header points to its ledger piece.
+  std::string npies = sql("SELECT NPIES FROM MIRVAE");
+  EXPECT_FALSE(npies.empty());
+  EXPECT_EQ(nombre("SELECT count(*) FROM PIECE WHERE NPIES = '" + npies + "'"), 1);
+  EXPECT_EQ(valeur("V_CMODEL"), "");
+}
+
+TEST_F(DocumentTest, SavingAndCreatingANewPieceKeepsTheEntryModel) {
+  ASSERT_TRUE(facture());
+  ecran().variable("V_CMODEL")->affecterTexte("VTPOSE");
+  enregistrer("2");
+  ASSERT_EQ(nombre("SELECT count(*) FROM MIRVAE"), 1);
+  EXPECT_FALSE(sql("SELECT NPIES FROM MIRVAE").empty());
+  EXPECT_EQ(mode(), "C");
+  EXPECT_EQ(ecran().identifiantDocument(), "");
+  EXPECT_EQ(valeur("MIRVAE.NPIEC"), "[PIECE]");
+  EXPECT_EQ(valeur("V_CMODEL"), "VTPOSE");
+}
+
+TEST_F(DocumentTest, ModificationIsRefusedForAnOldDateOrAPieceThatCanNoLongerChange) {
+  sql("INSERT INTO PIECE (NPIES, NPIEC, IMPUT) VALUES ('00000000077', 'VT7', 'O')");
+  const struct {
+    const char* cas;
+    const char* ident;
+    const char* dtope;
+    const char* npies;
+    const char* mode;
+    const char* message;  // nullptr: none
+  } cases[] = {
+      {"avant l'exercice", "00000911", "2023-12-15", "",
+       "V", "La date d'opération est antérieure à la date de début d'exercice.@La modification est impossible !"},
+      {"pièce validée", "00000912", "2024-03-10", "00000000077", "V",
+       "Cette pièce est validée définitivement.@La modification est impossible !"},
+      {"modifiable", "00000913", "2024-03-10", "", "M", nullptr},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.cas);
+    operationEnregistree(c.ident, "FC", c.dtope, c.npies);
+    std::size_t before = messages().size();
+    ASSERT_TRUE(ouvrirFiche(c.ident, "VMCAm"));
+    EXPECT_EQ(mode(), c.mode);
+    if (c.message) {
+      EXPECT_EQ(dernierMessage(), c.message);
+    } else {
+      EXPECT_EQ(messages().size(), before);
+    }
+    model::fermer(session());
+  }
+}
+
+TEST_F(DocumentTest, DeletionIsRefusedForAFinalPiece) {
+  sql("INSERT INTO PIECE (NPIES, NPIEC, IMPUT) VALUES ('00000000078', 'VT7', 'O')");
+  operationEnregistree("00000921", "FC", "2024-03-10", "00000000078");
+  ASSERT_TRUE(ouvrirFiche("00000921", "VMCAv"));
+  EXPECT_FALSE(appuyer("SUPPRESSION"));
+  EXPECT_EQ(dernierMessage(), "Cette pièce est validée définitivement.@La suppression est impossible !");
+  EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE WHERE IDENT = '00000921'"), 1);
+  model::fermer(session());
+
+  operationEnregistree("00000922");
+  ASSERT_TRUE(ouvrirFiche("00000922", "VMCAv"));
+  EXPECT_TRUE(appuyer("SUPPRESSION"));
+  EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE WHERE IDENT = '00000922'"), 0);
+  EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAL WHERE NUMERO LIKE '00000922|%'"), 0);
+}
+
+TEST_F(DocumentTest, AnotherKindsOperationIsNeverShown) {
+  operationEnregistree("00000931", "FF");
+  ouvrirFiche("00000931", "VMCAv");
+  EXPECT_FALSE(ouvert());
+  EXPECT_EQ(dernierMessage(), "La fiche « 00000931 » n'est pas accessible depuis cet écran.");
+}
+
+TEST_F(DocumentTest, OpeningARecordShowsItsClientOrSaysItIsGone) {
+  operationEnregistree("00000941");
+  ASSERT_TRUE(ouvrirFiche("00000941", "VMCAv"));
+  EXPECT_EQ(valeur("VLIBCP1"), "Brasserie Lissandre");
+  EXPECT_EQ(model::lignes(session()).size(), 2u);
+  model::fermer(session());
+
+  sql("UPDATE MIRVAE SET NUMCP = '411999' WHERE IDENT = '00000941'");
+  ASSERT_TRUE(ouvrirFiche("00000941", "VMCAv"));
+  EXPECT_EQ(valeur("VLIBCP1"), "Compte Client <411999> inexistant !");
+}
+
+TEST_F(DocumentTest, RecordInformationTellsWhoMadeAndChangedIt) {
+  operationEnregistree("00000951");
+  ASSERT_TRUE(ouvrirFiche("00000951", "VMCAv"));
+  ASSERT_TRUE(appuyer("COMMANDE1"));
+  EXPECT_EQ(valeur("V_INFO_FICHE"),
+            "Composant : MIRVAE - N° interne : 00000951\r\n\r\n"
+            "Date de création : 10/03/2024 - Heure : 09:15:00\r\n"
+            "Date de modification : 12/03/2024 - Heure : 16:40:05\r\n\r\n"
+            "Utilisateur : compta\r\n");
+  EXPECT_NE(dernierMessage().find("Date de création : 10/03/2024 - Heure : 09:15:00\n"), std::string::npos);
+}
+
+TEST_F(DocumentTest, DuplicatingStartsACreationWithoutPieceNumbers) {
+  operationEnregistree("00000961", "FC", "2024-03-10", "00000000079");
+  ASSERT_TRUE(ouvrirFiche("00000961", "VMCAv"));
+  ASSERT_TRUE(appuyer("CREAT2"));
+  EXPECT_EQ(mode(), "C");
+  EXPECT_EQ(valeur("IDENT_ORIGINE"), "00000961");
+  EXPECT_EQ(valeur("MIRVAE.NPIEC"), "[PIECE]");
+  EXPECT_EQ(valeur("MIRVAE.NPIES"), "");
+  EXPECT_EQ(valeur("MIRVAE.INPIE"), "Facture client n° [PIECE]");
+  EXPECT_EQ(valeur("VLIBCP1"), "Brasserie Lissandre");
+}
+
+}  // namespace
