@@ -165,11 +165,13 @@ class DocumentCycleTest : public testing_support::DossierTest {
   }
   // Opens the document with an identifier and a mode string, as an access screen does.
   bool ouvrirDocument(const std::string& ident, const std::string& modes) {
-    return session().action([&] {
-      Chaine id(ident), mode(modes);
-      session().ouvrir(Registre::instance().creer("TEST-MODELE_DOCUMENT", new EvtParamVal(2, &id, &mode)));
-    });
+    Chaine id(ident), mode(modes);
+    launches_.push_back(std::make_unique<EvtParamVal>(2, &id, &mode));
+    return session().action(
+        [&] { session().ouvrir(Registre::instance().creer("TEST-MODELE_DOCUMENT", launches_.back().get())); });
   }
+  // Launch events outlive their screens, which the session closes first.
+  std::vector<std::unique_ptr<Evt>> launches_;
   void saisirLigne(const std::string& account, const std::string& amount) {
     ASSERT_TRUE(model::nouvelleLigne(session()));
     ASSERT_TRUE(model::saisir(session(), "LST_MIRVAL.NUMCP", account));
