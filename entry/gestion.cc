@@ -334,11 +334,11 @@ void EntryScreen::debut_fiche(Evt* e) {
   lireJournal();
   procedure("SAISIE_MTT");
   lireOuVider(PIECE, PIECE_NPIES, MIRVAE_NPIES);
-  Chaine PIDENT_DEVISE(MIRVAE_MONNAIE_IDENT.chaine());
-  Date PDATE(MIRVAE_DTOPE.jour());
-  Double PCOURS(0);
-  Chaine PINFOS("DB");
-  EvtParamRef bascule(4, &PIDENT_DEVISE, &PDATE, &PCOURS, &PINFOS);
+  Chaine devise(MIRVAE_MONNAIE_IDENT.chaine());
+  Date date(MIRVAE_DTOPE.jour());
+  Double taux(0);
+  Chaine options("DB");
+  EvtParamRef bascule(4, &devise, &date, &taux, &options);
   procedure("CTRL_BASCULER", &bascule);
   procedure("CALCUL_TOTAUX");
 }

@@ -65,25 +65,26 @@ void EntryScreen::cours(Evt*) {
 // Parameters: currency (empty: the service's current one), date of the rate, rate
 // (0: the rate of that day), option letters.
 void EntryScreen::ctrl_basculer(Evt* e) {
-  Chaine PIDENT_("PIDENT", "", "", 4, this), PINFOS("PINFOS", "", "", 4, this);
+  // PIDENT is also the screen's launch parameter: the local goes by another name here.
+  Chaine devise("PIDENT", "", "", 4, this), PINFOS("PINFOS", "", "", 4, this);
   Date PDATE("PDATE", "", "", 4, this);
   Double PCOURS("PCOURS", "", "", 4, this);
-  e->param(0, PIDENT_, 0);
+  e->param(0, devise, 0);
   e->param(1, PDATE, 0);
   e->param(2, PCOURS, 0);
   e->param(3, PINFOS, 0);
   Devises& devises = euro();
-  if (PIDENT_.estVide()) PIDENT_ = devises.courante();
+  if (devise.estVide()) devise = devises.courante();
   ecran()->affiche("MONNAIE_IDENT", "TBL_MONNAIE", "");
   if (PINFOS.estVide() && !enVisualisation()) PINFOS = "QRB";
 
   // To be completed: the switch converts the amounts of a document that has lines,
   // after the user confirmed. Until it does, such a change is refused whole.
   MEM_MIRVAL.initRequete();
-  if (PINFOS.position("Q") > 0 && PIDENT_.chaine() != devises.courante() && MEM_MIRVAL.nombre() > 0)
+  if (PINFOS.position("Q") > 0 && devise.chaine() != devises.courante() && MEM_MIRVAL.nombre() > 0)
     throw HostError("le changement de devise d'une pièce qui a déjà des lignes n'est pas encore possible");
 
-  devises.definirCourante(PIDENT_.chaine(), PDATE.jour(), PCOURS.decimal());
+  devises.definirCourante(devise.chaine(), PDATE.jour(), PCOURS.decimal());
   Automate::ctrl_basculer(e);
   MIRVAE_MONNAIE_IDENT = devises.courante();
   PCOURS = devises.coursCourant();
@@ -111,7 +112,8 @@ void EntryScreen::actualiser_info_monetaires(Evt*) {
 // keeping currency when that is not the reference currency.
 void EntryScreen::definir_bascule(Evt*) {
   Devises& devises = euro();
-  const Champ& cible = devises.estReference(PARAM_MONNAIE_IDENT.chaine()) ? PARAM_MONNAIE_CMP_IDENT : PARAM_MONNAIE_IDENT;
+  bool reference = devises.estReference(PARAM_MONNAIE_IDENT.chaine());
+  const Champ& cible = reference ? PARAM_MONNAIE_CMP_IDENT : PARAM_MONNAIE_IDENT;
   devises.definirBascule(MIRVAE_MONNAIE_IDENT.chaine(), cible.chaine());
 }
 

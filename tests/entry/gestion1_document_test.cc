@@ -62,6 +62,18 @@ TEST_F(DocumentTest, CreationProposesTodayUnlessItIsPastTheClosingDate) {
   }
 }
 
+TEST_F(DocumentTest, CurrencyTakesItsRateOfTheDayAndAFixedRateCannotBeTyped) {
+  ASSERT_TRUE(creer());
+  EXPECT_EQ(valeur("MIRVAE.COURS"), "1");
+  EXPECT_TRUE(ecran().ecran()->estInterdit("COURS"));
+  ASSERT_TRUE(saisir("MIRVAE.MONNAIE_IDENT", "USD"));
+  EXPECT_EQ(valeur("MIRVAE.COURS"), "1.105");
+  EXPECT_FALSE(ecran().ecran()->estInterdit("COURS"));
+  EXPECT_FALSE(saisir("MIRVAE.MONNAIE_IDENT", ""));
+  EXPECT_EQ(dernierMessage(), "La saisie d'une monnaie est obligatoire !");
+  EXPECT_EQ(valeur("MIRVAE.MONNAIE_IDENT"), "USD");
+}
+
 TEST_F(DocumentTest, AbandoningTheDialogSavesNothing) {
   ASSERT_TRUE(facture());
   enregistrer("0");
