@@ -151,12 +151,16 @@ void Table::activeRequete() {
   active_ = true;
 }
 
-std::string Table::where(bool forText) const {
+std::string Table::where(bool forText, const std::string& seekColumn) const {
   std::string sql;
   int n = 0;
   for (const auto& f : filters_) {
     sql += n++ ? (forText ? " And " : " AND ") : (forText ? " Where " : " WHERE ");
     std::string column = quoteIdent(f.column);
+    // SQLite seeks an index with one lower bound per column: on the column a position
+    // starts with, the position is the tighter one, so the filter's own is written
+    // +COLUMN and only checked row by row.
+    std::string lower = f.column == seekColumn ? "+" + column : column;
     if (forText) {
       std::string value = f.value.stockage();
       switch (f.op) {
@@ -172,9 +176,9 @@ std::string Table::where(bool forText) const {
     switch (f.op) {
       case '=': sql += column + " = ?"; break;
       case '#': sql += column + " <> ?"; break;
-      case '+': sql += column + " >= ?"; break;
+      case '+': sql += lower + " >= ?"; break;
       case '-': sql += column + " <= ?"; break;
-      case '/': sql += "(" + column + " >= ? AND " + column + " < ?)"; break;
+      case '/': sql += "(" + lower + " >= ? AND " + column + " < ?)"; break;
       case '?': sql += "instr(" + column + ", ?) > 0"; break;
     }
   }
@@ -251,10 +255,21 @@ int Table::suivant(int mode, char) {
   open();
   if (!active_) throw HostError("requête de « " + alias() + " » non activée");
   bool after = mode == 1 && rowid_.has_value();
-  std::string sql = "SELECT *, rowid FROM " + sqlName() + where(false);
+  // The position is the current row's key in the request's order. A column that a
+  // filter holds equal is the same on every row of the request, so it is left out:
+  // the rest then follows the equality prefix of the index, and SQLite seeks straight
+  // to the next row instead of walking again from the first row of the request.
+  std::vector<std::string> position;
+  if (after)
+    for (const auto& c : order_) {
+      bool heldEqual = false;
+      for (const auto& f : filters_) heldEqual = heldEqual || (f.column == c && f.op == '=');
+      if (!heldEqual) position.push_back(c);
+    }
+  std::string sql = "SELECT *, rowid FROM " + sqlName() + where(false, position.empty() ? "" : position.front());
   if (after) {
     std::string keys, marks;
-    for (const auto& c : order_) {
+    for (const auto& c : position) {
       keys += quoteIdent(c) + ", ";
       marks += "?, ";
     }
@@ -265,7 +280,7 @@ int Table::suivant(int mode, char) {
   int next = 1;
   bindFilters(s, next);
   if (after) {
-    for (const auto& c : order_) s.bind(next++, buffer_[index(c)]);
+    for (const auto& c : position) s.bind(next++, buffer_[index(c)]);
     s.bind(next++, *rowid_);
   }
   bool found = s.step();

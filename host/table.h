@@ -104,7 +104,8 @@ class Table {
   void open();
   std::size_t index(const std::string& column);
   Valeur& slot(std::size_t i);
-  std::string where(bool forText) const;
+  // The WHERE clause of the filters; `seekColumn`: the column a position starts with.
+  std::string where(bool forText, const std::string& seekColumn = {}) const;
   void bindFilters(Statement& s, int& next) const;
   std::string orderBy() const;
   void load(Statement& s);

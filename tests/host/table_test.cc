@@ -1,6 +1,7 @@
 #include "host/table.h"
 
 #include <gtest/gtest.h>
+#include <sqlite3.h>
 
 #include "host/error.h"
 #include "model/traitmnt.h"
@@ -107,6 +108,55 @@ TEST_F(TableTest, RequestTextRunsInSqlite) {
   EXPECT_NO_THROW(base().exec(text)) << text;
 }
 
+// A request over an index, with an equality and a range on its first columns, as the
+// lists ask: the rows come once each in index order (ties broken by the next columns),
+// and the row after the current one is sought, not walked to from the request's first
+// row: the last step costs what the first does, however far the request has gone.
+TEST_F(TableTest, NextRowOfARequestIsSoughtThroughItsIndex) {
+  base().exec(R"(
+    WITH RECURSIVE n(i) AS (SELECT 0 UNION ALL SELECT i + 1 FROM n WHERE i + 1 < 900)
+    INSERT INTO MIRVAE (IDENT, TYPE, DTOPE, NPIEC)
+    SELECT printf('%08d', 900 - i), CASE i % 3 WHEN 0 THEN 'FF' ELSE 'FC' END,
+           date('2024-01-01', printf('+%d days', i / 10)), printf('VT%02d', i % 2) FROM n)");
+  Table mirvae(owner_.get(), "", "MIRVAE", "");
+  Champ type("TYPE", &mirvae), dtope("DTOPE", &mirvae), npiec("NPIEC", &mirvae), ident("IDENT", &mirvae);
+  mirvae.initRequete();
+  mirvae.ajouteFiltre(type, '=', "FC");
+  mirvae.ajouteFiltre(dtope, '+', Valeur::date(*lireJour("01/02/2024")));
+  mirvae.ajouteFiltre(dtope, '-', Valeur::date(*lireJour("29/02/2024")));
+  mirvae.choisitIndex("INDX1");
+  mirvae.activeRequete();
+
+  // Work of each finished request of the cursor, in virtual machine steps.
+  std::vector<int> steps;
+  sqlite3_trace_v2(
+      base().brut(), SQLITE_TRACE_PROFILE,
+      [](unsigned, void* out, void* statement, void*) {
+        auto* stmt = static_cast<sqlite3_stmt*>(statement);
+        if (std::string(sqlite3_sql(stmt)).find("rowid) >") != std::string::npos)
+          static_cast<std::vector<int>*>(out)->push_back(sqlite3_stmt_status(stmt, SQLITE_STMTSTATUS_VM_STEP, 1));
+        return 0;
+      },
+      &steps);
+  std::vector<std::string> seen;
+  for (int rc = mirvae.suivant(3); rc == 0; rc = mirvae.suivant(1))
+    seen.push_back(dtope.chaine() + " " + npiec.chaine() + " " + ident.chaine());
+  sqlite3_trace_v2(base().brut(), 0, nullptr, nullptr);
+
+  std::vector<std::string> expected;
+  host::Statement& s = base().prepare(
+      "SELECT DTOPE, NPIEC, IDENT FROM MIRVAE WHERE TYPE = 'FC' AND DTOPE BETWEEN '2024-02-01' AND '2024-02-29' "
+      "ORDER BY DTOPE, NPIEC, IDENT");
+  while (s.step())
+    expected.push_back(s.text(0).substr(8, 2) + "/" + s.text(0).substr(5, 2) + "/" + s.text(0).substr(0, 4) + " " +
+                       s.text(1) + " " + s.text(2));
+  s.reset();
+  ASSERT_GT(expected.size(), 150u);
+  EXPECT_EQ(seen, expected);
+  ASSERT_GT(steps.size(), 100u);
+  EXPECT_LT(steps.back(), 2 * steps.front() + 20) << "first step " << steps.front() << ", last " << steps.back();
+}
+
 TEST_F(TableTest, BadValuesAreRefusedWithTheirName) {
   Table mirvae(owner_.get(), "", "MIRVAE", "");
   Champ ht("HT", &mirvae), dtope("DTOPE", &mirvae);
@@ -118,6 +168,25 @@ TEST_F(TableTest, BadValuesAreRefusedWithTheirName) {
   }
   EXPECT_THROW(dtope = "31/02/2024", HostError);
   EXPECT_THROW(Champ("NOPE", &mirvae).chaine(), HostError);
+}
+
+}  // namespace
+
+namespace {
+
+TEST_F(TableTest, MemoryImageOutlivesAFailedActionThatMadeIt) {
+  Table image(owner_.get(), "", "MEM:MIRVAL", "MEM_MIRVAL");
+  Champ numero("NUMERO", &image);
+  bool ok = session().action([&] {
+    image.raz();  // the image is made here, inside the unit that fails
+    throw host::HostError("échec voulu");
+  });
+  EXPECT_FALSE(ok);
+  image.raz();
+  numero = "A|000001";
+  EXPECT_NO_THROW(image.ecrit());
+  image.initRequete();
+  EXPECT_EQ(image.nombre(), 1);
 }
 
 }  // namespace
