@@ -181,6 +181,10 @@ void Database::rollback() {
   depth_ = 0;
   for (auto& [sql, s] : wrappers_) s.reset();
   exec("ROLLBACK");
+  // Private copies made during the unit went with it; their owners still hold
+  // bindings on them, so they come back, empty.
+  for (const auto& [name, model] : private_copies_)
+    if (!existe(name)) creerCopiePrivee(model, name);
 }
 
 const std::vector<Colonne>& Database::colonnes(const std::string& table) {
@@ -228,18 +232,26 @@ void Database::creerCopiePrivee(const std::string& model, const std::string& nam
   std::string sql = s.text(0);
   s.reset();
   std::size_t open = sql.find('(');
-  forget(name);
+  // The columns stay cached: bindings hold on to them, and a copy made again (after
+  // a rollback) has the same ones.
+  forgetStatements(name);
   exec("DROP TABLE IF EXISTS temp." + quoteIdent(name));
   exec("CREATE TEMP TABLE " + quoteIdent(name) + " " + sql.substr(open));
+  private_copies_[name] = model;
 }
 
 void Database::supprimerCopiePrivee(const std::string& name) {
+  private_copies_.erase(name);
   forget(name);
   exec("DROP TABLE IF EXISTS temp." + quoteIdent(name));
 }
 
 void Database::forget(const std::string& table) {
   columns_.erase(table);
+  forgetStatements(table);
+}
+
+void Database::forgetStatements(const std::string& table) {
   // Statements over a dropped table would fail; drop every cached one that names it.
   for (auto it = wrappers_.begin(); it != wrappers_.end();) {
     if (it->first.find(quoteIdent(table)) != std::string::npos) {

@@ -86,6 +86,7 @@ class Database {
  private:
   Database(sqlite3* db, std::string path) : db_(db), path_(std::move(path)) {}
   void forget(const std::string& table);
+  void forgetStatements(const std::string& table);
 
   sqlite3* db_;
   std::string path_;
@@ -93,6 +94,7 @@ class Database {
   std::map<std::string, std::unique_ptr<sqlite3_stmt, void (*)(sqlite3_stmt*)>> statements_;
   std::map<std::string, Statement> wrappers_;
   std::map<std::string, std::vector<Colonne>> columns_;
+  std::map<std::string, std::string> private_copies_;  // name -> dossier table it copies
 };
 
 // "NAME" quoted for SQL.

@@ -7,6 +7,7 @@
 #include "posting/creer_piece_fc.h"
 #include "posting/supprimer_piece.h"
 #include "posting/verifier_modif_piece.h"
+#include "printing/interface.h"
 #include "services/services.h"
 
 namespace registry {
@@ -23,6 +24,11 @@ host::Chaine* crashFlag = nullptr;
 void declarerUnites() {
   // Units are added here in load order as their modules are built.
 
+  // Unit ACCES1.
+  static const Global acces1Global("MIRVAE", "MIRVAE");
+  static const Module acces1("", "MIRVAE-ACCES1", &host::fabriquer<browser::MIRVAEAcces1>, false, "");
+  static const Source acces1Source("MIRVAE", nullptr);
+
   // Unit CREER_PIECE_FC, GESTION1, SUPPRIMER_PIECE, VERIFIER_MODIF_PIECE.
   static const Global postingGlobal("MIRVAE", "MIRVAE");
   static const Module creerPieceFc("", "MIRVAE-CREER_PIECE_FC", &host::fabriquer<MIRVAECreer_piece_fc>, false, "");
@@ -31,6 +37,12 @@ void declarerUnites() {
   static const Module verifierModifPiece("", "MIRVAE-VERIFIER_MODIF_PIECE",
                                          &host::fabriquer<MIRVAEVerifier_modif_piece>, false, "");
   static const Source postingSource("MIRVAE", nullptr);
+
+  // Unit INTERFACE: it also works with the globals of the general-ledger library.
+  static const Global interfaceComptaGlobal("COMPTA", "MIRVAE");
+  static const Global interfaceGlobal("MIRVAE", "MIRVAE");
+  static const Module interface("", "MIRVAE-INTERFACE", &host::fabriquer<printing::MIRVAEInterface>, false, "");
+  static const Source interfaceSource("MIRVAE", nullptr);
 }
 
 }  // namespace

@@ -4,6 +4,7 @@
 #include "services/compta.h"
 #include "services/cpcdtva.h"
 #include "services/cpcompt.h"
+#include "services/cppiece.h"
 #include "services/cpparam.h"
 #include "services/messages.h"
 #include "services/monnaie.h"
@@ -29,6 +30,7 @@ void chargerServices() {
   Module("", "ZEFNDOC-INTERFACE", &fabriquer<Zefndoc>, false, "");
   Module("", "ZEFMDS-NETTOYAGE_PARAMLST1_LISTE", &fabriquer<Nettoyage_paramlst1_liste>, false, "");
   Module("", "SYSASCII-INTERFACE", &fabriquer<Sysascii>, false, "");
+  chargerGrandLivre();
 }
 
 }  // namespace services

@@ -262,3 +262,28 @@ INSTANTIATE_TEST_SUITE_P(
                       Depart{"DELETE FROM PARAM", ""}));
 
 }  // namespace
+
+namespace {
+
+class RegistreTest : public testing_support::DossierTest {};
+
+TEST_F(RegistreTest, UnitsDeclareInLoadOrder) {
+  std::vector<std::string> library;
+  for (const auto& d : host::Registre::instance().declarations())
+    if (d.name.rfind("MIRVAE", 0) == 0 || d.sorte != host::Declaration::kModule) {
+      const char* kind[] = {"Global", "Module", "Source", "Variable"};
+      library.push_back(std::string(kind[d.sorte]) + " " + d.name);
+    }
+  std::vector<std::string> expected = {
+      "Global MIRVAE", "Module MIRVAE-ACCES1", "Source MIRVAE",
+      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_FC", "Module MIRVAE-GESTION1", "Module MIRVAE-SUPPRIMER_PIECE",
+      "Module MIRVAE-VERIFIER_MODIF_PIECE", "Source MIRVAE",
+      "Global COMPTA", "Global MIRVAE", "Module MIRVAE-INTERFACE", "Source MIRVAE"};
+  EXPECT_EQ(library, expected);
+  for (const auto& d : host::Registre::instance().declarations())
+    if (d.sorte == host::Declaration::kModule && d.name.rfind("MIRVAE", 0) == 0) {
+      EXPECT_EQ(d.label, "") << d.name;
+    }
+}
+
+}  // namespace

@@ -14,17 +14,6 @@ namespace {
 
 using host::Decimal;
 
-// Stand-ins registered only while the real modules are not: the message box and the
-// accounting library's removal procedures.
-struct Messages : host::Automate {
-  explicit Messages(host::Evt* e) : Automate(e) {
-    addBranch("MESS_OK", [this](host::Evt* ev) { BoiteMessage(ev->parametre(0).chaine(), 0, nullptr); });
-  }
-};
-struct Compta : host::Automate {
-  explicit Compta(host::Evt* e) : Automate(e) { services::ajouterProceduresPieces(*this); }
-};
-
 Decimal montant(const std::string& text) { return text.empty() ? Decimal() : *Decimal::parse(text); }
 
 void inserer(host::Database& db, const std::string& sql, const std::vector<std::string>& values) {
@@ -38,12 +27,6 @@ void inserer(host::Database& db, const std::string& sql, const std::vector<std::
 
 void PostingTest::SetUp() {
   DossierTest::SetUp();
-  services::chargerGrandLivre();
-  auto& registre = host::Registre::instance();
-  if (!registre.module("CPMESSAG-INTERFACE"))
-    host::Module("", "CPMESSAG-INTERFACE", &host::fabriquer<Messages>, false, "");
-  if (!registre.module("COMPTA-MOD_CAL_BIBLIOPROC"))
-    host::Module("", "COMPTA-MOD_CAL_BIBLIOPROC", &host::fabriquer<Compta>, false, "");
   services::importTestHooks() = {};
   services::importTestHooks().onCall = [this](const std::string& procedure, const std::string& account) {
     appels_.push_back(account.empty() ? procedure : procedure + " " + account);
