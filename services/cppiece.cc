@@ -58,6 +58,19 @@ long long nextNumber(Database& db, const std::string& counter, const std::string
   return n;
 }
 
+// The largest number of `width` digits in a text key column, as the query `usedMax`
+// of nextNumber wants it. The numbers this component hands out all have that width,
+// so only those can collide with the next one; among them text order is number order,
+// and the key's index gives the largest at once instead of reading the whole table
+// each time a piece is numbered.
+std::string largestNumber(const std::string& table, const std::string& column, int width) {
+  std::string quoted = "\"" + column + "\"";
+  return "SELECT coalesce((SELECT CAST(" + quoted + " AS INTEGER) FROM \"" + table + "\" WHERE " + quoted +
+         " BETWEEN '" + std::string(width, '0') + "' AND '" + std::string(width, '9') + "' AND length(" + quoted +
+         ") = " + std::to_string(width) + " AND " + quoted + " NOT GLOB '*[^0-9]*' ORDER BY " + quoted +
+         " DESC LIMIT 1), 0)";
+}
+
 struct Allocation {
   std::string section;
   Decimal debit, credit;
@@ -276,7 +289,7 @@ void PieceImport::debut_import(Evt* e) {
   // An instance left open by an import that stopped half-way is given up.
   if (instance_) closeInstance("A");
   std::string number = padded(
-      nextNumber(db(), "IMPORT_INSTANCE", "SELECT coalesce(max(CAST(\"NINST\" AS INTEGER)), 0) FROM \"IMPORT_INSTANCE\""),
+      nextNumber(db(), "IMPORT_INSTANCE", largestNumber("IMPORT_INSTANCE", "NINST", kInstanceNumberWidth)),
       kInstanceNumberWidth);
   execute(db(), "INSERT INTO \"IMPORT_INSTANCE\" (\"NINST\", \"ETAT\", \"DTCRE\") VALUES (?, 'O', ?)", number,
           host::jourIso(host::clock::today()));
@@ -306,8 +319,7 @@ int PieceImport::debutPiece(host::Donnee& npies) {
   piece.rate = row->at("COURS").empty() ? 0 : std::stod(row->at("COURS"));
   piece.origin = row->at("CORIG");
   piece.npies = padded(
-      nextNumber(db(), "PIECE", "SELECT coalesce(max(CAST(\"NPIES\" AS INTEGER)), 0) FROM \"PIECE\""),
-      kPieceNumberWidth);
+      nextNumber(db(), "PIECE", largestNumber("PIECE", "NPIES", kPieceNumberWidth)), kPieceNumberWidth);
   npies = piece.npies;
   instance_->piece = std::move(piece);
   return kImportOk;

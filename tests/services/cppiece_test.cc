@@ -1,6 +1,7 @@
 #include "services/cppiece.h"
 
 #include <gtest/gtest.h>
+#include <sqlite3.h>
 
 #include "model/traitmnt.h"
 #include "tests/posting/posting_fixture.h"
@@ -209,6 +210,35 @@ TEST_F(CppieceTest, NumbersAreNeverHandedOutTwice) {
   EXPECT_GT(npies("OP000003"), first);
   EXPECT_EQ(compte("SELECT count(DISTINCT UNIQ) FROM MOUVE"), 4);
   EXPECT_EQ(compte("SELECT count(DISTINCT NUSYS) FROM ECHEA"), 2);
+}
+
+// Numbering a piece finds the largest number already in the ledger through the keys,
+// not by reading every piece and instance: posting stays as fast in a dossier of
+// years as in a new one. Numbers of another shape are no obstacle.
+TEST_F(CppieceTest, NumberingFindsTheLargestNumberThroughTheKeys) {
+  base().exec(R"(
+    WITH RECURSIVE n(i) AS (SELECT 1 UNION ALL SELECT i + 1 FROM n WHERE i < 2000)
+    INSERT INTO PIECE (NPIES) SELECT printf('%011d', i) FROM n;
+    WITH RECURSIVE n(i) AS (SELECT 1 UNION ALL SELECT i + 1 FROM n WHERE i < 2000)
+    INSERT INTO IMPORT_INSTANCE (NINST, ETAT) SELECT printf('%08d', i), 'F' FROM n;
+    INSERT INTO PIECE (NPIES) VALUES ('P99'), ('9'), ('0000000300x');)");
+  // Work of the numbering statements, in virtual machine steps.
+  long long steps = 0;
+  sqlite3_trace_v2(
+      base().brut(), SQLITE_TRACE_PROFILE,
+      [](unsigned, void* out, void* statement, void*) {
+        auto* stmt = static_cast<sqlite3_stmt*>(statement);
+        if (std::string(sqlite3_sql(stmt)).find("NDOC") != std::string::npos)
+          *static_cast<long long*>(out) += sqlite3_stmt_status(stmt, SQLITE_STMTSTATUS_VM_STEP, 1);
+        return 0;
+      },
+      &steps);
+  ecrire({.lignes = {{"706000", "100"}}});
+  poster();
+  sqlite3_trace_v2(base().brut(), 0, nullptr, nullptr);
+  EXPECT_EQ(npies(), "00000002001");
+  EXPECT_EQ(sql("SELECT NINST FROM PIECE WHERE NPIES = '00000002001'"), "00002001");
+  EXPECT_LT(steps, 1000);
 }
 
 }  // namespace
