@@ -201,7 +201,9 @@ long long Valeur::entier() const {
 
 double Valeur::reel() const {
   if (genre_ == Genre::Double) return std::get<double>(v_);
-  if (genre_ == Genre::Simple) return std::get<float>(v_);
+  // A float widened bit for bit would carry its binary noise (19.6f is
+  // 19.600000381...): it goes through its shortest decimal text instead.
+  if (genre_ == Genre::Simple) return decimal().toDouble();
   return decimal().toDouble();
 }
 

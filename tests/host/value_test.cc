@@ -93,3 +93,18 @@ TEST(Donnee, BoundVariableReadsAndWritesItsTarget) {
 
 }  // namespace
 }  // namespace host
+
+namespace host {
+namespace {
+
+TEST(Simple, BecomesADoubleThroughItsDecimalText) {
+  Simple rate("VTXTVA", "", "", 0, nullptr);
+  Double copy("TXTVA", "", "", 0, nullptr);
+  rate = "19.6";
+  copy = rate;
+  EXPECT_EQ(copy.reel(), 19.6);
+  EXPECT_EQ(copy.chaine(), "19.6");
+}
+
+}  // namespace
+}  // namespace host
