@@ -185,6 +185,8 @@ void Database::rollback() {
   // bindings on them, so they come back, empty.
   for (const auto& [name, model] : private_copies_)
     if (!existe(name)) creerCopiePrivee(model, name);
+  // A copy given back during the unit got its rows back with it.
+  for (const auto& [model, name] : spare_copies_) emptyCopy(name);
 }
 
 const std::vector<Colonne>& Database::colonnes(const std::string& table) {
@@ -242,8 +244,31 @@ void Database::creerCopiePrivee(const std::string& model, const std::string& nam
 
 void Database::supprimerCopiePrivee(const std::string& name) {
   private_copies_.erase(name);
+  for (auto it = spare_copies_.begin(); it != spare_copies_.end();)
+    it = it->second == name ? spare_copies_.erase(it) : std::next(it);
   forget(name);
   exec("DROP TABLE IF EXISTS temp." + quoteIdent(name));
+}
+
+void Database::libererCopiePrivee(const std::string& name) {
+  auto copy = private_copies_.find(name);
+  if (copy == private_copies_.end()) return;
+  emptyCopy(name);
+  spare_copies_.emplace(copy->second, name);
+}
+
+std::optional<std::string> Database::reprendreCopiePrivee(const std::string& model) {
+  auto spare = spare_copies_.find(model);
+  if (spare == spare_copies_.end()) return std::nullopt;
+  std::string name = spare->second;
+  spare_copies_.erase(spare);
+  return name;
+}
+
+void Database::emptyCopy(const std::string& name) {
+  Statement& s = prepare("DELETE FROM temp." + quoteIdent(name));
+  s.step();
+  s.reset();
 }
 
 void Database::forget(const std::string& table) {

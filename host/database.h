@@ -10,6 +10,7 @@
 
 #include <map>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -79,6 +80,13 @@ class Database {
   // memory images): same columns, same keys, no rows.
   void creerCopiePrivee(const std::string& model, const std::string& name);
   void supprimerCopiePrivee(const std::string& name);
+  // A memory image's copy outlives its automaton: it is emptied and kept for the next
+  // one that needs a copy of the same table, because making or dropping a table
+  // changes the schema, after which SQLite prepares every cached statement again.
+  // libererCopiePrivee gives a copy back; reprendreCopiePrivee hands out an empty
+  // spare copy of `model`, or nothing when there is none.
+  void libererCopiePrivee(const std::string& name);
+  std::optional<std::string> reprendreCopiePrivee(const std::string& model);
 
   long long dernierId() const;
   sqlite3* brut() { return db_; }
@@ -87,6 +95,7 @@ class Database {
   Database(sqlite3* db, std::string path) : db_(db), path_(std::move(path)) {}
   void forget(const std::string& table);
   void forgetStatements(const std::string& table);
+  void emptyCopy(const std::string& name);
 
   sqlite3* db_;
   std::string path_;
@@ -95,6 +104,7 @@ class Database {
   std::map<std::string, Statement> wrappers_;
   std::map<std::string, std::vector<Colonne>> columns_;
   std::map<std::string, std::string> private_copies_;  // name -> dossier table it copies
+  std::multimap<std::string, std::string> spare_copies_;  // dossier table -> its empty spare copies
 };
 
 // "NAME" quoted for SQL.

@@ -43,9 +43,9 @@ Table::~Table() {
       if (it != sharedImages().end()) sharedImages().erase(it);
     }
     try {
-      db_->supprimerCopiePrivee(physical_);
+      db_->libererCopiePrivee(physical_);
     } catch (...) {
-      // The connection is going away with the session; nothing left to drop.
+      // The connection is going away with the session; nothing left to keep.
     }
   }
 }
@@ -65,6 +65,9 @@ void Table::open() {
     SharedImage* shared = owner_ ? &sharedImages()[{owner_, name_}] : nullptr;
     if (shared && shared->bindings > 0) {
       physical_ = shared->physical;
+    } else if (std::optional<std::string> spare = db_->reprendreCopiePrivee(name_.substr(4))) {
+      physical_ = *spare;
+      if (shared) shared->physical = physical_;
     } else {
       physical_ = name_ + "#" + std::to_string(++memoryImageCounter);
       db_->creerCopiePrivee(name_.substr(4), physical_);

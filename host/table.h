@@ -15,8 +15,9 @@
 //     pasted into SQL. requete() gives the same request as text that SQLite runs,
 //     each condition written FIELD op 'value'.
 //   - A table whose name starts with "MEM:" is a memory image owned by its
-//     automaton: private, empty at first, dropped with the automaton. All the
-//     bindings of one image in one automaton (MEM_MIRVAANA and MEM_MIRVAANA2 on
+//     automaton: private, empty at first, emptied when the automaton goes (and
+//     kept for the next one that needs the same image). All the bindings of one
+//     image in one automaton (MEM_MIRVAANA and MEM_MIRVAANA2 on
 //     "MEM:MIRVAANA_M01") are cursors on the same rows. Work tables
 //     (_M01, _M02, MEM02, MEM04) are private to the session and shared by its
 //     automata. Every other table is the dossier's.

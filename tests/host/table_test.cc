@@ -160,6 +160,42 @@ TEST_F(TableTest, BadValuesAreRefusedWithTheirName) {
 
 namespace {
 
+// The copy behind a memory image is not dropped with its automaton but handed, empty,
+// to the next automaton that needs the same image: no table is made, so the schema
+// stays as it was and the cached statements need no new preparation. A copy given
+// back inside an action that fails gets its rows back with the rollback, and is
+// emptied again.
+TEST_F(TableTest, MemoryImageOfAGoneAutomatonIsHandedEmptyToTheNextOne) {
+  auto schemaVersion = [&] { return sql("PRAGMA temp.schema_version"); };
+  auto fill = [](Table& image) {
+    Champ numero("NUMERO", &image);
+    for (const char* n : {"A|000001", "A|000002"}) {
+      image.raz();
+      numero = n;
+      image.ecrit();
+    }
+  };
+  for (bool failing : {false, true}) {
+    SCOPED_TRACE(failing ? "given back in a failed action" : "given back");
+    auto first = std::make_unique<Porteur>(nullptr);
+    auto image = std::make_unique<Table>(first.get(), "", "MEM:MIRVAL", "MEM_MIRVAL");
+    fill(*image);
+    session().action([&] {
+      image.reset();
+      first.reset();
+      if (failing) throw HostError("échec voulu");
+    });
+    std::string version = schemaVersion();
+    Porteur second(nullptr);
+    Table next(&second, "", "MEM:MIRVAL", "MEM_MIRVAL");
+    next.initRequete();
+    EXPECT_EQ(next.nombre(), 0);
+    EXPECT_EQ(schemaVersion(), version);
+    fill(next);
+    EXPECT_EQ(next.nombre(), 2);
+  }
+}
+
 TEST_F(TableTest, MemoryImageOutlivesAFailedActionThatMadeIt) {
   Table image(owner_.get(), "", "MEM:MIRVAL", "MEM_MIRVAL");
   Champ numero("NUMERO", &image);
