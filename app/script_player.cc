@@ -75,6 +75,7 @@ ScriptPlayer::ScriptPlayer(std::vector<Instruction> script, std::ostream& out)
     : script_(std::move(script)), out_(out) {}
 
 void ScriptPlayer::play(host::Session& session) {
+  if (session_ != &session) printed_ = 0;  // another session numbers its entries from 0
   session_ = &session;
   while (!failure_ && next_ < script_.size()) playNext();
   if (!failure_ && !answers_.empty()) {
@@ -140,7 +141,8 @@ void ScriptPlayer::execute(const Instruction& line) {
     case Op::DeleteLine:
     case Op::AbandonLine:
     case Op::Select: {
-      std::size_t start = session_->transcript().entrees().size();
+      const host::Transcript& transcript = session_->transcript();
+      std::size_t start = transcript.oubliees() + transcript.entrees().size();
       action_start_ = start;
       bool accepted = act(line);
       // Lines played inside a modal screen moved the mark; this action, which
@@ -174,8 +176,9 @@ bool ScriptPlayer::act(const Instruction& line) {
 }
 
 std::vector<host::Entree> ScriptPlayer::shownSinceAction() const {
-  const auto& entries = session_->transcript().entrees();
-  std::size_t from = std::min(action_start_, entries.size());
+  const host::Transcript& transcript = session_->transcript();
+  const auto& entries = transcript.entrees();
+  std::size_t from = std::min(std::max(action_start_, transcript.oubliees()) - transcript.oubliees(), entries.size());
   return {entries.begin() + static_cast<std::ptrdiff_t>(from), entries.end()};
 }
 
@@ -350,13 +353,14 @@ std::optional<std::string> ScriptPlayer::choisir(const std::string& window, cons
 
 void ScriptPlayer::flush() {
   if (!session_) return;
-  const auto& entries = session_->transcript().entrees();
-  if (printed_ > entries.size()) printed_ = 0;  // the transcript was emptied
+  const host::Transcript& transcript = session_->transcript();
+  const auto& entries = transcript.entrees();
   host::Transcript fresh;
-  for (std::size_t i = printed_; i < entries.size(); ++i) fresh.ajouter(entries[i].sorte, entries[i].texte);
+  for (std::size_t i = std::max(printed_, transcript.oubliees()) - transcript.oubliees(); i < entries.size(); ++i)
+    fresh.ajouter(entries[i].sorte, entries[i].texte);
   out_ << fresh.rendu();
   out_.flush();
-  printed_ = entries.size();
+  printed_ = transcript.oubliees() + entries.size();
 }
 
 }  // namespace app

@@ -74,9 +74,9 @@ class ScriptPlayer : public host::UserAgent {
   const Instruction* current_ = nullptr;
   std::deque<Answer> answers_;
   std::optional<ScriptError> failure_;
-  std::size_t action_start_ = 0;
+  std::size_t action_start_ = 0;  // transcript entry numbers (host::Transcript)
   std::optional<bool> last_accepted_;
-  std::size_t printed_ = 0;
+  std::size_t printed_ = 0;       // entries before this number are printed
 };
 
 }  // namespace app

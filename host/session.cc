@@ -21,7 +21,14 @@ bool estTableDeTravail(const std::string& name) {
 
 // ---------------------------------------------------------------------------- Transcript
 
-void Transcript::ajouter(std::string sorte, std::string texte) { entries_.push_back({std::move(sorte), std::move(texte)}); }
+void Transcript::ajouter(std::string sorte, std::string texte) {
+  // The oldest half goes at once, so that keeping the bound costs one move per entry.
+  if (entries_.size() >= 2 * kGardees) {
+    entries_.erase(entries_.begin(), entries_.begin() + static_cast<std::ptrdiff_t>(kGardees));
+    forgotten_ += kGardees;
+  }
+  entries_.push_back({std::move(sorte), std::move(texte)});
+}
 
 std::vector<std::string> Transcript::textes(const std::string& sorte) const {
   std::vector<std::string> out;

@@ -39,17 +39,30 @@ struct Entree {
   std::string texte;
 };
 
+// The transcript keeps the most recent entries only (at least kGardees): a session
+// that posts an import of a hundred thousand invoices must not grow with it. Entries
+// are numbered from the session's first one, so a reader that noted where it stopped
+// (oubliees() + entrees().size()) finds its place again after older entries went.
 class Transcript {
  public:
+  static constexpr std::size_t kGardees = 10000;
+
   void ajouter(std::string sorte, std::string texte);
+  // The entries kept, oldest first; the first one is number oubliees().
   const std::vector<Entree>& entrees() const { return entries_; }
+  // How many entries went before the ones kept (dropped, or emptied by vider()).
+  std::size_t oubliees() const { return forgotten_; }
   // Texts of one kind, in order.
   std::vector<std::string> textes(const std::string& sorte) const;
   std::string rendu() const;  // one line an entry, for people
-  void vider() { entries_.clear(); }
+  void vider() {
+    forgotten_ += entries_.size();
+    entries_.clear();
+  }
 
  private:
   std::vector<Entree> entries_;
+  std::size_t forgotten_ = 0;
 };
 
 // The user. Screens never block on a terminal: every question comes here.

@@ -134,6 +134,24 @@ TEST(Registre, ResolvesLibraryAndModuleToItsRegistryName) {
   EXPECT_EQ(Registre::nomModule("", "", "AGIR"), "AGIR");
 }
 
+// A long session keeps only its recent entries, numbered from its first one, so that
+// a reader who noted where it stopped finds its place again; emptying keeps counting.
+TEST(Transcript, KeepsTheRecentEntriesUnderTheirNumbers) {
+  Transcript transcript;
+  const std::size_t total = 2 * Transcript::kGardees + 5;
+  for (std::size_t n = 0; n < total; ++n) transcript.ajouter("action", std::to_string(n));
+  const auto& kept = transcript.entrees();
+  EXPECT_GE(kept.size(), Transcript::kGardees);
+  EXPECT_LT(kept.size(), 2 * Transcript::kGardees);
+  EXPECT_EQ(transcript.oubliees() + kept.size(), total);
+  EXPECT_EQ(kept.front().texte, std::to_string(transcript.oubliees()));
+  EXPECT_EQ(kept.back().texte, std::to_string(total - 1));
+  transcript.vider();
+  transcript.ajouter("message", "après");
+  EXPECT_EQ(transcript.oubliees(), total);
+  EXPECT_EQ(transcript.textes("message"), std::vector<std::string>{"après"});
+}
+
 struct Casse : model::Traitmnt {
   explicit Casse(Evt* e) : Traitmnt(e) { throw std::runtime_error("constructeur en échec"); }
 };
