@@ -407,6 +407,8 @@ void EntryScreen::validation(Evt* e) {
 
 void EntryScreen::apres_validation(Evt* e) {
   Sdocum::apres_validation(e);
+  // The piece the operation had: the save replaces it within this same user action.
+  bool remplace = !MIRVAE_NPIES.estVide() && lireOuVider(PIECE, PIECE_NPIES, MIRVAE_NPIES);
   EvtParamVal suppression(2, &MIRVAE_NPIES, "N");
   appelerModule("", "MIRVAE", "SUPPRIMER_PIECE", &suppression);
   Chaine VIDENT("VIDENT", "", "", 4, this);
@@ -416,7 +418,13 @@ void EntryScreen::apres_validation(Evt* e) {
   // The posting wrote the new piece number into the header.
   if (table(false)->lit(3, MIRVAE_IDENT, '=', VIDENT) != 0)
     throw HostError("l'opération « " + VIDENT.chaine() + " » a disparu pendant sa comptabilisation");
-  lireOuVider(PIECE, PIECE_NPIES, MIRVAE_NPIES);
+  bool comptabilisee = !MIRVAE_NPIES.estVide() && lireOuVider(PIECE, PIECE_NPIES, MIRVAE_NPIES);
+  // A modification whose new piece the ledger refused would leave the operation with
+  // no piece at all: the whole save is undone instead, the old piece with it.
+  if (remplace && !comptabilisee)
+    throw HostError(
+        "La nouvelle pièce n'a pas pu être comptabilisée : la modification n'est pas enregistrée, "
+        "l'ancienne pièce est conservée.");
   ecran()->affiche("P1", "GRP1", "LST", "GRP_TOT", "");
   if (V_IMPR_FICHE == 1) procedure("IMPR_FICHE");
   V_IMPR_FICHE = 0;

@@ -18,9 +18,6 @@ using host::Source;
 
 namespace {
 
-// The crash flag of the access screens' model; the library itself never reads it.
-host::Chaine* crashFlag = nullptr;
-
 void declarerUnites() {
   // Units are added here in load order as their modules are built.
 
@@ -51,7 +48,8 @@ void chargerBibliotheque() {
   static bool loaded = false;
   if (loaded) return;
   loaded = true;
-  crashFlag = new host::Chaine("$$|VCODECRASHFLAG", "", "", 2, "CRASHFLAG", nullptr);
+  // The crash flag of the access screens' model; the library itself never reads it.
+  [[maybe_unused]] static host::Chaine crashFlag("$$|VCODECRASHFLAG", "", "", 2, "CRASHFLAG", nullptr);
   declarerUnites();
   services::chargerServices();
 }
