@@ -167,13 +167,19 @@ Statement& Database::prepare(const std::string& sql) {
 }
 
 void Database::begin() {
-  if (depth_ == 0) exec("BEGIN IMMEDIATE");
+  if (depth_ == 0) run("BEGIN IMMEDIATE");
   ++depth_;
 }
 
 void Database::commit() {
   if (depth_ == 0) return;
-  if (--depth_ == 0) exec("COMMIT");
+  if (--depth_ == 0) run("COMMIT");
+}
+
+void Database::run(const std::string& sql) {
+  Statement& s = prepare(sql);
+  s.step();
+  s.reset();
 }
 
 void Database::rollback() {
@@ -207,6 +213,8 @@ const std::vector<Colonne>& Database::colonnes(const std::string& table) {
 }
 
 std::vector<std::string> Database::colonnesIndex(const std::string& table, const std::string& index) {
+  auto known = index_columns_.find({table, index});
+  if (known != index_columns_.end()) return known->second;
   std::vector<std::string> names;
   sqlite3_stmt* stmt = nullptr;
   std::string sql = "SELECT name FROM pragma_index_info(?) ORDER BY seqno";
@@ -215,6 +223,7 @@ std::vector<std::string> Database::colonnesIndex(const std::string& table, const
   sqlite3_bind_text(stmt, 1, full.c_str(), -1, SQLITE_TRANSIENT);
   while (sqlite3_step(stmt) == SQLITE_ROW) names.emplace_back(reinterpret_cast<const char*>(sqlite3_column_text(stmt, 0)));
   sqlite3_finalize(stmt);
+  index_columns_.emplace(std::make_pair(table, index), names);
   return names;
 }
 
@@ -265,14 +274,12 @@ std::optional<std::string> Database::reprendreCopiePrivee(const std::string& mod
   return name;
 }
 
-void Database::emptyCopy(const std::string& name) {
-  Statement& s = prepare("DELETE FROM temp." + quoteIdent(name));
-  s.step();
-  s.reset();
-}
+void Database::emptyCopy(const std::string& name) { run("DELETE FROM temp." + quoteIdent(name)); }
 
 void Database::forget(const std::string& table) {
   columns_.erase(table);
+  for (auto it = index_columns_.begin(); it != index_columns_.end();)
+    it = it->first.first == table ? index_columns_.erase(it) : std::next(it);
   forgetStatements(table);
 }
 

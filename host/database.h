@@ -96,6 +96,9 @@ class Database {
   void forget(const std::string& table);
   void forgetStatements(const std::string& table);
   void emptyCopy(const std::string& name);
+  // Runs a statement without result through the cache: a unit begins and ends at
+  // every user action, and preparing those each time was a measurable part of one.
+  void run(const std::string& sql);
 
   sqlite3* db_;
   std::string path_;
@@ -103,6 +106,7 @@ class Database {
   std::map<std::string, std::unique_ptr<sqlite3_stmt, void (*)(sqlite3_stmt*)>> statements_;
   std::map<std::string, Statement> wrappers_;
   std::map<std::string, std::vector<Colonne>> columns_;
+  std::map<std::pair<std::string, std::string>, std::vector<std::string>> index_columns_;  // (table, index)
   std::map<std::string, std::string> private_copies_;  // name -> dossier table it copies
   std::multimap<std::string, std::string> spare_copies_;  // dossier table -> its empty spare copies
 };
