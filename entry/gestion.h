@@ -22,6 +22,7 @@
 // amount is the typed one plus or minus that VAT, so HT + TVA = TTC on every line.
 #pragma once
 
+#include <functional>
 #include <string>
 
 #include "entry/kinds.h"
@@ -77,7 +78,7 @@ class EntryScreen : public model::Gestion_document2 {
   void validation_table_mirvaana(Evt* e);
   void dialogue(Evt* e) override;
 
-  // ---- entry models and line import (gestion_currency.cc)
+  // ---- entry models and line import (gestion_models.cc)
   void importation_lignes(Evt* e);
   void v_cmodel(Evt* e);
   void v_cmodel_choisir(Evt* e);
@@ -143,6 +144,9 @@ class EntryScreen : public model::Gestion_document2 {
   void ctrl_actualiser_bascule(Evt* e) override;
   void actualiser_info_monetaires(Evt* e);
   void definir_bascule(Evt* e);
+  // The currency switch converts the document's lines, and the analytic rows of
+  // those lines that wait in the work table to be saved with them.
+  void convertAmounts(const std::function<Decimal(const Decimal&)>& convert) override;
 
  protected:
   // ---- helpers shared by the handlers
@@ -180,6 +184,19 @@ class EntryScreen : public model::Gestion_document2 {
   // Completes a line whose account was just read into COMPT2 (VAT code and rate,
   // amounts, analytic codes).
   void completerLigne();
+  // Reads into `t` the account `account` among those of nature `nature` ("" any) that
+  // the lists offer (CCTRA not "O"); blanks the record and returns false when none.
+  static bool readAccountOfNature(Table& t, Champ& numcp, Champ& natuc, Champ& cctra, const std::string& account,
+                                  const char* nature);
+  // Runs "CTRL_BASCULER" for the operation's currency at its date, with `options`.
+  void switchCurrency(const char* options);
+  // Whether the document has lines in memory.
+  bool hasLines();
+  // Adds a line of the current model line (MODLI) on the account read into COMPT2.
+  void addModelLine();
+  // Copies the analytic rows of source line `source` to the line in MIRVAL, each
+  // amount through `atNewRate`.
+  void copyAnalyticRows(const std::string& source, const std::function<Decimal(const Donnee&)>& atNewRate);
 
   const EntryKind& kind_;
 

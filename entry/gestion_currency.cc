@@ -1,13 +1,18 @@
-// Currency of the operation, entry models and the import of a duplicated operation's
-// lines.
+// The currency of the operation and its rate.
 //
-// To be completed with the host's currency switch: the confirmation asked before a
-// document with lines changes currency, the conversion of its amounts, the fixed-rate
-// currencies in the switch; and with the entry models and the line import. Until
-// then these handlers do the least that keeps a document right: the currency and
-// rate of a document are set from the currency service, a currency change on a
-// document that has lines is refused as not handled yet, and models and imports add
-// no lines.
+// An operation is entered in one currency at one rate; its amounts are in that
+// currency. The currency service of the session holds the current currency of the
+// document on screen; every change goes through the host's currency switch
+// ("CTRL_BASCULER"), which asks this screen whether the change may be made
+// ("CTRL_ACTUALISER_MODE": never while a line is typed, and only once the user
+// confirmed for a document that has lines), converts the document's amounts, then
+// lets the screen catch up ("CTRL_ACTUALISER_BASCULE").
+//
+// Option letters of the switch: "D" the document as it stands (a record opened or
+// copied, a rate typed): its amounts are already in the currency and are not
+// converted, and without a rate given it keeps its own; "Q" ask before converting a
+// document that has lines; "R" take the currency into the header; "B" define the
+// conversion pair again.
 #include "entry/gestion.h"
 
 #include "host/currency.h"
@@ -15,21 +20,28 @@
 
 namespace entry {
 
-// ---------------------------------------------------------------------------- entry models, line import
+namespace {
 
-// To be completed: copies the duplicated operation's lines and analytic rows.
-void EntryScreen::importation_lignes(Evt*) {}
-// To be completed: checks the model code and runs "MODTE_GENERER".
-void EntryScreen::v_cmodel(Evt*) {}
-void EntryScreen::v_cmodel_choisir(Evt*) { procedure("MODTE_CHOISIR"); }
-// To be completed: the model choice window.
-void EntryScreen::modte_choisir(Evt*) {}
-// To be completed: replaces the lines by the model's.
-void EntryScreen::modte_generer(Evt*) {}
+bool option(const Donnee& options, char letter) { return options.chaine().find(letter) != std::string::npos; }
 
-// ---------------------------------------------------------------------------- currency
+}  // namespace
 
-void EntryScreen::monnaie_choisir(Evt*) {
+// Runs "CTRL_BASCULER" for the operation's currency at its date, with `options`.
+void EntryScreen::switchCurrency(const char* options) {
+  Chaine devise(MIRVAE_MONNAIE_IDENT.chaine());
+  Date date(MIRVAE_DTOPE.jour());
+  Double taux(0);
+  Chaine lettres(options);
+  EvtParamRef bascule(4, &devise, &date, &taux, &lettres);
+  procedure("CTRL_BASCULER", &bascule);
+}
+
+bool EntryScreen::hasLines() {
+  MEM_MIRVAL.initRequete();
+  return MEM_MIRVAL.nombre() > 0;
+}
+
+void EntryScreen::monnaie_choisir(Evt* e) {
   if (enVisualisation()) {
     messageOk("Opération interdite en mode visualisation !");
     return;
@@ -38,27 +50,40 @@ void EntryScreen::monnaie_choisir(Evt*) {
     messageOk("Le changement de devise est interdit en cours de saisie de ligne !");
     return;
   }
-  // To be completed: the currency choice window.
+  // The window writes its pick into its parameter: the header keeps its currency
+  // until the switch accepts the new one.
+  Chaine devise(MIRVAE_MONNAIE_IDENT.chaine());
+  EvtParamRef choix(1, &devise);
+  appelerProcedure("*", "MONNAIE", "INTERFACE", "CHOIX", &choix, -1);
+  int code = erreurMethode();
+  erreurMethode(code, e);
+  if (code == 2) {
+    controler("MONNAIE_IDENT");
+    rejeter(e);
+    return;
+  }
+  if (code != 0) return;
+  I_MONNAIE.initRequete();
+  I_MONNAIE.activeRequete();
+  if (I_MONNAIE.suivant(3) != 0) throw HostError("la monnaie choisie n'a pas été lue dans I_MONNAIE");
+  MIRVAE_MONNAIE_IDENT = I_MONNAIE_IDENT;
+  switchCurrency("QRB");
+  erreurMethode(erreurMethode(), e);
 }
 
 void EntryScreen::monnaie_ident(Evt* e) {
   if (MIRVAE_MONNAIE_IDENT.estVide()) return refuser(e, "La saisie d'une monnaie est obligatoire !", "MONNAIE_IDENT");
-  Chaine devise(MIRVAE_MONNAIE_IDENT.chaine());
-  Date date(MIRVAE_DTOPE.jour());
-  Double taux(0);
-  Chaine options("QRB");
-  EvtParamRef bascule(4, &devise, &date, &taux, &options);
-  procedure("CTRL_BASCULER", &bascule);
+  switchCurrency("QRB");
+  // A change declined or refuseded puts the currency typed back.
+  if (erreurMethode() != 0) {
+    controler("MONNAIE_IDENT");
+    rejeter(e);
+  }
 }
 
 void EntryScreen::cours(Evt*) {
   euro().saisirCours(MIRVAE_MONNAIE_IDENT.chaine(), MIRVAE_DTOPE.jour(), MIRVAE_COURS.decimal());
-  Chaine devise(MIRVAE_MONNAIE_IDENT.chaine());
-  Date date(MIRVAE_DTOPE.jour());
-  Double taux(0);
-  Chaine options("DB");
-  EvtParamRef bascule(4, &devise, &date, &taux, &options);
-  procedure("CTRL_BASCULER", &bascule);
+  switchCurrency("DB");
   ecran()->affiche("COURS", "");
 }
 
@@ -77,30 +102,80 @@ void EntryScreen::ctrl_basculer(Evt* e) {
   if (devise.estVide()) devise = devises.courante();
   ecran()->affiche("MONNAIE_IDENT", "TBL_MONNAIE", "");
   if (PINFOS.estVide() && !enVisualisation()) PINFOS = "QRB";
+  // A saved operation keeps the rate it was entered at, not the rate of the day.
+  if (option(PINFOS, 'D') && PCOURS.decimal().isZero() && devise == MIRVAE_MONNAIE_IDENT &&
+      MIRVAE_COURS.decimal().sign() > 0 && !devises.estCoursFixe(devise.chaine()))
+    PCOURS = MIRVAE_COURS.decimal();
 
-  // To be completed: the switch converts the amounts of a document that has lines,
-  // after the user confirmed. Until it does, such a change is refused whole.
-  MEM_MIRVAL.initRequete();
-  if (PINFOS.position("Q") > 0 && devise.chaine() != devises.courante() && MEM_MIRVAL.nombre() > 0)
-    throw HostError("le changement de devise d'une pièce qui a déjà des lignes n'est pas encore possible");
-
-  devises.definirCourante(devise.chaine(), PDATE.jour(), PCOURS.decimal());
-  Automate::ctrl_basculer(e);
+  EvtParamRef bascule(4, &devise, &PDATE, &PCOURS, &PINFOS);
+  Automate::ctrl_basculer(&bascule);
+  int refused = erreurMethode();
+  // Declined or refuseded, the switch left the service as it was: the header shows
+  // the currency and rate the document keeps.
   MIRVAE_MONNAIE_IDENT = devises.courante();
-  PCOURS = devises.coursCourant();
+  if (refused == 0) PCOURS = devises.coursCourant();
   MIRVAE_COURS = devises.coursCourant();
   if (devises.estCoursFixe(MIRVAE_MONNAIE_IDENT.chaine()))
     ecran()->interdit("COURS", "");
   else
     ecran()->autorise("COURS", "");
   ecran()->affiche("COURS", "");
+  erreurMethode(refused, e);
 }
 
-// To be completed with the currency switch (confirmation, conversion).
-void EntryScreen::ctrl_actualiser_mode(Evt* e) { Saisie::ctrl_actualiser_mode(e); }
+void EntryScreen::ctrl_actualiser_mode(Evt* e) {
+  Chaine devise("PIDENT", "", "", 4, this), PINFOS("PINFOS", "", "", 4, this);
+  Date PDATE("PDATE", "", "", 4, this);
+  Double PCOURS("PCOURS", "", "", 4, this);
+  e->param(0, devise, 0);
+  e->param(1, PDATE, 0);
+  e->param(2, PCOURS, 0);
+  e->param(3, PINFOS, 0);
+  if (!enVisualisation() && lineInEntry()) return erreurMethode(1, e);
 
-// To be completed with the currency switch (new pair, amounts in memory).
-void EntryScreen::ctrl_actualiser_bascule(Evt* e) { Automate::ctrl_actualiser_bascule(e); }
+  Devises& devises = euro();
+  if (option(PINFOS, 'Q') && devise.chaine() != devises.courante() && hasLines()) {
+    EvtParamRef question(2, "Confirmez-vous le changement de devise et le recalcul de la pièce ?", &V_CHOIX);
+    compta("MESS_ON", &question);
+    if (V_CHOIX != "1") return erreurMethode(1, e);
+  }
+  devises.definirCourante(devise.chaine(), PDATE.jour(), PCOURS.decimal());
+  MIRVAE_MONNAIE_IDENT = devises.courante();
+  procedure("ACTUALISER_INFO_MONETAIRES");
+  erreurMethode(0, e);
+}
+
+void EntryScreen::ctrl_actualiser_bascule(Evt* e) {
+  Chaine PINFOS("PINFOS", "", "", 4, this);
+  e->param(3, PINFOS, 0);
+  if (option(PINFOS, 'R')) MIRVAE_MONNAIE_IDENT = euro().courante();
+  if (option(PINFOS, 'B')) procedure("DEFINIR_BASCULE");
+  procedure("MAJ_LIGNES_MEMOIRE");
+  procedure("ACTUALISER_INFO_MONETAIRES");
+  Automate::ctrl_actualiser_bascule(e);
+}
+
+void EntryScreen::convertAmounts(const std::function<Decimal(const Decimal&)>& convert) {
+  Automate::convertAmounts(convert);
+  MEM_MIRVAL.initRequete();
+  MEM_MIRVAL.activeRequete();
+  for (int rc = MEM_MIRVAL.suivant(3); rc == 0; rc = MEM_MIRVAL.suivant(1)) {
+    std::string ident = MEM_MIRVAL.valeur("IDENT").chaine();
+    // A line without identifier has no analytic rows yet; its empty prefix would
+    // select every row.
+    if (ident.empty()) continue;
+    MIRVAANA_M01.initRequete();
+    MIRVAANA_M01.ajouteFiltre(MIRVAANA_M01_NUMERO, '/', ident + "|");
+    MIRVAANA_M01.activeRequete();
+    for (int row = MIRVAANA_M01.suivant(3); row == 0; row = MIRVAANA_M01.suivant(1)) {
+      MIRVAANA_M01_MTADE = convert(MIRVAANA_M01_MTADE.decimal());
+      MIRVAANA_M01_MTACR = convert(MIRVAANA_M01_MTACR.decimal());
+      MIRVAANA_M01.ecrit();
+    }
+  }
+  MIRVAANA_M01.initRequete();
+  MEM_MIRVAL.initRequete();
+}
 
 void EntryScreen::actualiser_info_monetaires(Evt*) {
   EvtParamRef devise(1, &MIRVAE_MONNAIE_IDENT);

@@ -1,5 +1,8 @@
 #include "host/automate.h"
 
+#include <algorithm>
+
+#include "host/currency.h"
 #include "host/error.h"
 #include "host/session.h"
 #include "host/table.h"
@@ -155,8 +158,46 @@ Table* Automate::table(bool) { return main_table_.get(); }
 void Automate::debut(Evt*) {}
 void Automate::selection_tri(Evt*) {}
 void Automate::ctrl_defaut_colonne(Evt*) {}
-void Automate::ctrl_basculer(Evt*) {}
+void Automate::ctrl_basculer(Evt* e) {
+  Devises& devises = euro();
+  std::string from = devises.courante();
+  Decimal fromRate = devises.coursCourant();
+  if (aBranche("CTRL_ACTUALISER_MODE")) {
+    executer("CTRL_ACTUALISER_MODE", e);
+    if (error_code_ != 0) return;
+  }
+  std::string options = e && e->nbParams() > 3 ? e->parametre(3).chaine() : std::string();
+  std::string to = devises.courante();
+  if (to != from && options.find('D') == std::string::npos) {
+    Decimal toRate = devises.coursCourant();
+    if (fromRate.sign() <= 0)
+      throw HostError("cours « " + fromRate.toString(0) + " » de la monnaie « " + from + " » invalide");
+    convertAmounts([&](const Decimal& amount) { return devises.arrondir(amount * toRate / fromRate, to); });
+  }
+  if (aBranche("CTRL_ACTUALISER_BASCULE")) executer("CTRL_ACTUALISER_BASCULE", e);
+}
+
 void Automate::ctrl_actualiser_bascule(Evt*) {}
+
+void Automate::convertAmounts(const std::function<Decimal(const Decimal&)>& convert) {
+  // Names first: a cursor made below joins the automaton's tables.
+  std::vector<std::string> images;
+  for (const Table* t : tables_)
+    if (t->nom().rfind("MEM:", 0) == 0 && std::find(images.begin(), images.end(), t->nom()) == images.end())
+      images.push_back(t->nom());
+  for (const std::string& name : images) {
+    // A cursor of its own on the image's rows, so that no binding of the screen
+    // loses its buffer or position.
+    Table image(this, "", name.c_str(), "CONVERSION");
+    image.initRequete();
+    image.activeRequete();
+    for (int rc = image.suivant(3); rc == 0; rc = image.suivant(1)) {
+      for (const Colonne& c : image.colonnes())
+        if (c.genre == Genre::Monnaie) image.affecter(c.name, Valeur::montant(convert(image.valeur(c.name).decimal())));
+      image.ecrit();
+    }
+  }
+}
 
 // ---------------------------------------------------------------------------- declarations
 

@@ -110,8 +110,22 @@ class Automate {
   virtual void debut(Evt* e);
   virtual void selection_tri(Evt* e);
   virtual void ctrl_defaut_colonne(Evt* e);
+  // The currency switch. Parameters: currency code, date of the rate, rate (zero for
+  // the rate of that day), option letters. Runs the automaton's branch
+  // "CTRL_ACTUALISER_MODE", which makes the currency the service's current one or
+  // refuses (method result 1: nothing changes and the switch stops). When the current
+  // currency changed and the options hold no "D" (the document's amounts are not
+  // already in the new currency), the document's amounts are converted
+  // (convertAmounts). Then runs the branch "CTRL_ACTUALISER_BASCULE". A branch the
+  // automaton does not answer is skipped.
   virtual void ctrl_basculer(Evt* e);
+  // After a switch; the base does nothing.
   virtual void ctrl_actualiser_bascule(Evt* e);
+  // Converts the amounts of the document in front with `convert` (from the old
+  // currency at its rate to the new one at its rate, rounded to its decimals). The
+  // base converts every money column of every row of the automaton's memory images;
+  // a screen that keeps amounts of its document elsewhere converts those too.
+  virtual void convertAmounts(const std::function<Decimal(const Decimal&)>& convert);
 
   // ---- lifecycle, driven by the session through the model library
   // Runs the kind's start cycle (a process runs to its end here).
