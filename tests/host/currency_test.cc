@@ -2,7 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include "host/automate.h"
 #include "host/error.h"
+#include "host/table.h"
 #include "tests/support/fixture.h"
 
 namespace {
@@ -113,6 +115,74 @@ TEST_F(CurrencyTest, EachSessionHasItsOwnCurrentCurrency) {
   euro().definirCourante("JPY", jour("15/03/2024"));
   rouvrir();
   EXPECT_EQ(euro().courante(), "EUR");
+}
+
+// ---------------------------------------------------------------------------- the currency switch
+
+// A document with two lines in its memory image; its "CTRL_ACTUALISER_MODE" makes the
+// asked currency current unless told to refuse, as a screen does.
+struct Document : Automate {
+  explicit Document(bool refuse) : Automate(nullptr) {
+    addBranch("CTRL_ACTUALISER_MODE", [this, refuse](Evt* e) {
+      if (refuse) return erreurMethode(1, e);
+      euro().definirCourante(e->parametre(0).chaine(), e->parametre(1).jour());
+      erreurMethode(0, e);
+    });
+    addBranch("CTRL_ACTUALISER_BASCULE", [this](Evt*) { ++refreshed; });
+  }
+  void ligne(const char* numero, const char* ht, const char* tva) {
+    lines.raz();
+    lines.affecter("NUMERO", Valeur::texte(numero));
+    lines.affecter("NUMCP", Valeur::texte("708500"));
+    lines.affecter("HT", Valeur::montant(dec(ht)));
+    lines.affecter("TVA", Valeur::montant(dec(tva)));
+    lines.ecrit();
+  }
+  std::string montants() {
+    std::string out;
+    lines.initRequete();
+    lines.activeRequete();
+    for (int rc = lines.suivant(3); rc == 0; rc = lines.suivant(1))
+      out += lines.valeur("NUMCP").chaine() + " " + lines.valeur("HT").chaine() + " " + lines.valeur("TVA").chaine() + ";";
+    return out;
+  }
+  Table lines{this, "", "MEM:MIRVAL", "LIGNES"};
+  int refreshed = 0;
+};
+
+TEST_F(CurrencyTest, SwitchConvertsTheDocumentsMemoryOnlyWhenItsCurrencyChanges) {
+  const struct {
+    const char* cas;
+    const char* ident;
+    const char* options;
+    bool refuse;
+    const char* current;
+    const char* amounts;
+    int refreshed;
+  } cases[] = {
+      // 50.50 × 1.105 = 55.8025; no decimals in yen: 3126.6 and 7894.665 to the nearest.
+      {"dollars", "USD", "QRB", false, "USD", "708500 110.50 22.10;708500 55.80 0.00;", 1},
+      {"yens", "JPY", "QRB", false, "JPY", "708500 15633.00 3127.00;708500 7895.00 0.00;", 1},
+      {"déjà dans la devise", "USD", "DB", false, "USD", "708500 100.00 20.00;708500 50.50 0.00;", 1},
+      {"refusé", "USD", "QRB", true, "EUR", "708500 100.00 20.00;708500 50.50 0.00;", 0},
+      {"même devise", "EUR", "QRB", false, "EUR", "708500 100.00 20.00;708500 50.50 0.00;", 1},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.cas);
+    euro().definirCourante("EUR", jour("15/03/2024"));
+    Document document(c.refuse);
+    document.ligne("|000001", "100", "20");
+    document.ligne("|000002", "50.5", "0");
+    Chaine ident(c.ident), options(c.options);
+    Date date(jour("15/03/2024"));
+    Double rate(0);
+    EvtParamRef bascule(4, &ident, &date, &rate, &options);
+    document.ctrl_basculer(&bascule);
+    EXPECT_EQ(document.erreurMethode(), c.refuse ? 1 : 0);
+    EXPECT_EQ(euro().courante(), c.current);
+    EXPECT_EQ(document.montants(), c.amounts);
+    EXPECT_EQ(document.refreshed, c.refreshed);
+  }
 }
 
 }  // namespace

@@ -1,0 +1,156 @@
+// The currency of a client invoice: a change of currency converts the lines once the
+// user confirmed it, a fixed rate cannot be typed, a typed rate converts nothing, a
+// saved operation keeps its rate, and no change is made in visualisation or while a
+// line is being typed.
+#include <gtest/gtest.h>
+
+#include "host/currency.h"
+#include "tests/entry/gestion1_fixture.h"
+
+namespace {
+
+using testing_support::Gestion1Test;
+
+constexpr const char* kQuestion = "Confirmez-vous le changement de devise et le recalcul de la pièce ?";
+
+class DevisesTest : public Gestion1Test {
+ protected:
+  // A client invoice of two lines: 100 at 20 % and 50 without VAT.
+  bool facture() { return creer() && client() && ligne("708500", "100") && ligne("758000", "50"); }
+
+  // HT TVA TTC of each line, then the totals, as shown.
+  std::string montants() {
+    std::string out;
+    for (auto& row : model::lignes(session()))
+      out += row["MIRVAL.HT"] + " " + row["MIRVAL.TVA"] + " " + row["MIRVAL.TTC"] + " / ";
+    return out + valeur("V_TOT_HT") + " " + valeur("V_TOT_TVA") + " " + valeur("V_TOT_TTC");
+  }
+  std::size_t questions() { return session().transcript().textes("question").size(); }
+};
+
+TEST_F(DevisesTest, ChangingTheCurrencyOfADocumentWithLinesAsksThenConvertsOrKeepsEverything) {
+  const struct {
+    const char* cas;
+    const char* currency;
+    bool yes;
+    const char* shown;  // currency and rate afterwards
+    const char* amounts;
+  } cases[] = {
+      // 15/03/2024: 1.105 dollars, 156.33 yen for one euro.
+      {"dollars", "USD", true, "USD 1.105", "110.50 22.10 132.60 / 55.25 0.00 55.25 / 165.75 22.10 187.85"},
+      // No decimals in yen: 3126.6 and 7816.5 round to the nearest, halves away from zero.
+      {"yens", "JPY", true, "JPY 156.33", "15633.00 3127.00 18760.00 / 7817.00 0.00 7817.00 / 23450.00 3127.00 26577.00"},
+      {"refusé", "USD", false, "EUR 1", "100.00 20.00 120.00 / 50.00 0.00 50.00 / 150.00 20.00 170.00"},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.cas);
+    ASSERT_TRUE(facture());
+    std::size_t before = questions();
+    user_.ajouterOui(c.yes);
+    EXPECT_EQ(saisir("MIRVAE.MONNAIE_IDENT", c.currency), c.yes);
+    ASSERT_EQ(questions(), before + 1);
+    EXPECT_EQ(session().transcript().textes("question").back(), kQuestion);
+    EXPECT_EQ(valeur("MIRVAE.MONNAIE_IDENT") + " " + valeur("MIRVAE.COURS"), c.shown);
+    EXPECT_EQ(host::euro().courante(), std::string(c.shown).substr(0, 3));
+    EXPECT_EQ(montants(), c.amounts);
+    model::fermer(session());
+  }
+}
+
+TEST_F(DevisesTest, ADocumentWithoutLinesChangesCurrencyWithoutAQuestion) {
+  ASSERT_TRUE(creer());
+  ASSERT_TRUE(saisir("MIRVAE.MONNAIE_IDENT", "USD"));
+  EXPECT_EQ(questions(), 0u);
+  EXPECT_EQ(valeur("MIRVAE.COURS"), "1.105");
+  // The VAT of a line is rounded to the decimals of the currency now current.
+  ASSERT_TRUE(saisir("MIRVAE.MONNAIE_IDENT", "JPY"));
+  ASSERT_TRUE(client());
+  ASSERT_TRUE(ligne("708500", "1001"));
+  EXPECT_EQ(model::lignes(session())[0]["MIRVAL.TVA"], "200.00");
+}
+
+TEST_F(DevisesTest, TheChoiceWindowChangesTheCurrencyAndACancelKeepsIt) {
+  ASSERT_TRUE(creer());
+  user_.ajouterChoix(std::nullopt);
+  EXPECT_FALSE(appuyer("MONNAIE_CHOISIR"));
+  EXPECT_EQ(valeur("MIRVAE.MONNAIE_IDENT"), "EUR");
+  user_.ajouterChoix("USD");
+  EXPECT_TRUE(appuyer("MONNAIE_CHOISIR"));
+  EXPECT_EQ(valeur("MIRVAE.MONNAIE_IDENT") + " " + valeur("MIRVAE.COURS"), "USD 1.105");
+}
+
+TEST_F(DevisesTest, AFixedRateCannotBeTyped) {
+  const struct {
+    const char* currency;
+    const char* rate;
+    bool fixed;
+  } cases[] = {{"EUR", "1", true},       {"FRF", "6.55957", true}, {"XPF", "119.331742", true},
+               {"USD", "1.105", false},  {"JPY", "156.33", false}};
+  ASSERT_TRUE(creer());
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.currency);
+    ASSERT_TRUE(saisir("MIRVAE.MONNAIE_IDENT", c.currency));
+    EXPECT_EQ(valeur("MIRVAE.COURS"), c.rate);
+    EXPECT_EQ(ecran().ecran()->estInterdit("COURS"), c.fixed);
+    EXPECT_EQ(saisir("MIRVAE.COURS", "2"), !c.fixed);
+  }
+}
+
+// A rate typed by hand stays the document's and leaves its amounts as they are: they
+// are in dollars whatever the rate.
+TEST_F(DevisesTest, ATypedRateConvertsNothing) {
+  user_.ajouterOui(true);
+  ASSERT_TRUE(facture());
+  ASSERT_TRUE(saisir("MIRVAE.MONNAIE_IDENT", "USD"));
+  ASSERT_TRUE(saisir("MIRVAE.COURS", "1.25"));
+  EXPECT_EQ(valeur("MIRVAE.COURS"), "1.25");
+  EXPECT_EQ(montants(), "110.50 22.10 132.60 / 55.25 0.00 55.25 / 165.75 22.10 187.85");
+  ASSERT_TRUE(enregistrer("1"));
+  EXPECT_EQ(sql("SELECT MONNAIE_IDENT || ' ' || COURS || ' ' || HT FROM MIRVAE"), "USD 1.25 165.75");
+}
+
+TEST_F(DevisesTest, ASavedOperationOpensAtItsOwnRate) {
+  operationEnregistree("00000971");
+  sql("UPDATE MIRVAE SET MONNAIE_IDENT = 'USD', COURS = 1.3 WHERE IDENT = '00000971'");
+  ASSERT_TRUE(ouvrirFiche("00000971", "VMCAv"));
+  EXPECT_EQ(valeur("MIRVAE.MONNAIE_IDENT") + " " + valeur("MIRVAE.COURS"), "USD 1.3");
+  EXPECT_EQ(host::euro().courante(), "USD");
+  EXPECT_EQ(montants(), "100.00 20.00 120.00 / 50.00 0.00 50.00 / 150.00 20.00 170.00");
+}
+
+TEST_F(DevisesTest, AConvertedModificationSavesItsAnalyticRowsInTheNewCurrency) {
+  operationEnregistree("00000981");
+  sql("INSERT INTO MIRVAANA (IDENT, NUMERO, CSECT, MTADE, MTACR) VALUES ('00000991', '00000981L1|', 'ATELIER', "
+      "'0', '60'), ('00000992', '00000981L1|', 'CHANTIER', '0', '40')");
+  ASSERT_TRUE(ouvrirFiche("00000981", "VMCAm"));
+  ASSERT_EQ(ecran().modeCourant(), "M");
+  user_.ajouterOui(true);
+  ASSERT_TRUE(saisir("MIRVAE.MONNAIE_IDENT", "USD"));
+  ASSERT_TRUE(appuyer("B_VALID_DOC"));
+  EXPECT_EQ(sql("SELECT MONNAIE_IDENT || ' ' || COURS || ' ' || HT || ' ' || TVA || ' ' || TTC FROM MIRVAE"),
+            "USD 1.105 165.75 22.1 187.85");
+  EXPECT_EQ(sql("SELECT group_concat(MTACR, ' ') FROM (SELECT MTACR FROM MIRVAANA ORDER BY CSECT)"), "66.3 44.2");
+}
+
+TEST_F(DevisesTest, NoChangeInVisualisationNorWhileALineIsTyped) {
+  operationEnregistree("00000961");
+  ASSERT_TRUE(ouvrirFiche("00000961", "VMCAv"));
+  EXPECT_TRUE(appuyer("MONNAIE_CHOISIR"));
+  EXPECT_EQ(dernierMessage(), "Opération interdite en mode visualisation !");
+  EXPECT_FALSE(saisir("MIRVAE.MONNAIE_IDENT", "USD"));
+  EXPECT_EQ(valeur("MIRVAE.MONNAIE_IDENT"), "EUR");
+  model::fermer(session());
+
+  ASSERT_TRUE(facture());
+  ASSERT_TRUE(ligne("706300", "30", "-", false));
+  ASSERT_TRUE(ecran().lineInEntry());
+  EXPECT_TRUE(appuyer("MONNAIE_CHOISIR"));
+  EXPECT_EQ(dernierMessage(), "Le changement de devise est interdit en cours de saisie de ligne !");
+  // Typed over, the currency is refused without a question and the amounts stay.
+  EXPECT_FALSE(saisir("MIRVAE.MONNAIE_IDENT", "USD"));
+  EXPECT_EQ(questions(), 0u);
+  EXPECT_EQ(valeur("MIRVAE.MONNAIE_IDENT") + " " + host::euro().courante(), "EUR EUR");
+  EXPECT_EQ(model::lignes(session())[0]["MIRVAL.HT"], "100.00");
+}
+
+}  // namespace
