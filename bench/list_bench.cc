@@ -1,0 +1,211 @@
+// List scaling: the client-invoice browser "MIRVAE-ACCES1" listing one month of a
+// dossier of 10,000 operations and of one of 1,000,000.
+//
+// Both dossiers hold about the same number of client invoices in the month listed
+// (MIRVAE_BENCH_LIST_MONTH, 100 by default): the operations of the six kinds are
+// spread back in time from March 2024, month after month, so the large dossier only
+// reaches further into the past. The request goes through the index MIRVAE_INDX1
+// (TYPE, DTOPE, ...), so listing the month must cost about the same in both: the
+// ratio large / small is the figure, and the target is at most 1.5.
+//
+// The dossiers are made with raw SQL in one transaction, not through the screens; the
+// browser reads only the headers, their pieces and their accounts, so no lines or
+// movements are made. The plan SQLite chose for each request on MIRVAE is printed once.
+//
+//   MIRVAE_BENCH_LIST_SMALL (10000)  MIRVAE_BENCH_LIST_LARGE (1000000)
+//   MIRVAE_BENCH_LIST_MONTH (100)    MIRVAE_BENCH_LISTINGS (50 listings per repetition)
+//   MIRVAE_BENCH_REPETITIONS (5)
+#include <sqlite3.h>
+
+#include <iostream>
+#include <set>
+
+#include "bench/bench_support.h"
+#include "model/mains.h"
+
+namespace {
+
+const long long kSmall = bench::size("MIRVAE_BENCH_LIST_SMALL", 10000);
+const long long kLarge = bench::size("MIRVAE_BENCH_LIST_LARGE", 1000000);
+const long long kPerMonth = bench::size("MIRVAE_BENCH_LIST_MONTH", 100);
+const long long kListings = bench::size("MIRVAE_BENCH_LISTINGS", 50);
+const long long kRepetitions = bench::size("MIRVAE_BENCH_REPETITIONS", 5);
+
+// The month listed: the last one of the generated operations, inside the demo
+// dossier's exercise.
+const char kMonth[] = "03/2024";
+
+// `count` operations, the six kinds in turn, `kPerMonth` of each kind a month going
+// back from March 2024; nine client invoices in ten posted (a PIECE row, half of
+// them final), the clients of the demo dossier in turn.
+void generate(host::Database& db, long long count) {
+  db.begin();
+  host::Statement& operations = db.prepare(R"(
+    WITH RECURSIVE n(i) AS (SELECT 0 UNION ALL SELECT i + 1 FROM n WHERE i + 1 < ?1)
+    INSERT INTO MIRVAE (IDENT, TYPE, DTOPE, NUMCP, NUMJL, NPIEC, INPIE, NPIES, MONNAIE_IDENT, COURS,
+                        DTECH, SAISIE_MTT, HT, TVA, TTC, DATEC, USERM)
+    SELECT printf('%08d', i + 1), kind,
+           date('2024-03-01', printf('-%d months', (i / 6) / ?2), printf('+%d days', (i / 6) % 28)),
+           CASE kind WHEN 'FC' THEN printf('41100%d', 1 + (i / 6) % 6) ELSE '401001' END,
+           CASE kind WHEN 'FC' THEN 'VT' ELSE 'OD' END,
+           printf('VT%06d', i / 6), printf('Facture client n° VT%06d', i / 6),
+           CASE WHEN kind = 'FC' AND (i / 6) % 10 <> 9 THEN printf('%011d', i + 1) ELSE '' END,
+           'EUR', 1, '2024-04-30', '1', '300', '60', '360', '2024-03-15', 'banc'
+    FROM (SELECT i, CASE i % 6 WHEN 0 THEN 'FC' WHEN 1 THEN 'FF' WHEN 2 THEN 'NDF' WHEN 3 THEN 'BQ'
+                                 WHEN 4 THEN 'CA' ELSE 'OD' END AS kind FROM n)
+  )");
+  operations.bind(1, count).bind(2, kPerMonth);
+  operations.step();
+  operations.reset();
+  db.exec(R"(
+    INSERT INTO PIECE (NPIES, NPIEC, NUMJL, DTOPE, IMPUT)
+    SELECT NPIES, NPIEC, NUMJL, DTOPE, CASE WHEN CAST(IDENT AS INTEGER) % 12 = 1 THEN 'O' ELSE '' END
+    FROM MIRVAE WHERE NPIES <> ''
+  )");
+  db.commit();
+}
+
+// A dossier of `count` operations, made once per process and kept until its end.
+const std::string& dossierOf(long long count) {
+  static std::map<long long, std::unique_ptr<bench::Dossier>> dossiers;
+  auto& slot = dossiers[count];
+  if (!slot) {
+    auto start = std::chrono::steady_clock::now();
+    slot = std::make_unique<bench::Dossier>("mirvae-list");
+    generate(slot->open().base(), count);
+    slot->close();
+    std::chrono::duration<double> took = std::chrono::steady_clock::now() - start;
+    std::cout << "dossier of " << count << " operations made in " << took.count() << " s\n" << std::flush;
+  }
+  return slot->path();
+}
+
+// A session on the dossier with the browser open on every period.
+struct OpenBrowser {
+  explicit OpenBrowser(const std::string& path)
+      : session(registry::ouvrirDossier(path), user, "banc") {
+    if (!model::ouvrir(session, "MIRVAE-ACCES1"))
+      throw host::HostError("l'écran MIRVAE-ACCES1 ne s'ouvre pas : " + session.transcript().rendu());
+  }
+  // One user action: the month typed into the period; the list is filled again.
+  std::size_t listMonth() {
+    if (!model::saisir(session, "VMOIAN", kMonth))
+      throw host::HostError("période refusée : " + session.transcript().rendu());
+    session.transcript().vider();
+    return model::lignes(session).size();
+  }
+  bench::ValidatingUser user;
+  host::Session session;
+};
+
+// The browser open on a dossier of `count` operations. Only one session is open at a
+// time, and opening the browser lists the whole dossier, so the last one is kept and
+// the repetitions of one size run one after the other.
+OpenBrowser& browserOn(long long count) {
+  static std::unique_ptr<OpenBrowser> browser;
+  static long long opened = 0;
+  if (!browser || opened != count) {
+    browser.reset();
+    browser = std::make_unique<OpenBrowser>(dossierOf(count));
+    opened = count;
+  }
+  return *browser;
+}
+
+void BM_ListOneMonth(benchmark::State& state) {
+  OpenBrowser& browser = browserOn(state.range(0));
+  std::size_t rows = browser.listMonth();  // warms the page cache and the statements
+  for (auto _ : state) {
+    for (long long i = 0; i < kListings; ++i) rows = browser.listMonth();
+  }
+  state.counters["rows"] = static_cast<double>(rows);
+  state.SetItemsProcessed(state.iterations() * kListings);
+}
+BENCHMARK(BM_ListOneMonth)
+    ->Arg(kLarge)
+    ->Arg(kSmall)
+    ->Iterations(1)
+    ->Repetitions(kRepetitions)
+    ->Unit(benchmark::kMillisecond)
+    ->UseRealTime();
+
+// The statements the browser ran on MIRVAE while listing the month, with the plan
+// SQLite chose for each. Returns false when one of them scans the table (or a whole
+// index), or when none goes through MIRVAE_INDX1.
+bool printPlans(OpenBrowser& browser) {
+  std::set<std::string> statements;
+  sqlite3* db = browser.session.base().brut();
+  sqlite3_trace_v2(
+      db, SQLITE_TRACE_STMT,
+      [](unsigned, void* context, void* statement, void*) {
+        const char* sql = sqlite3_sql(static_cast<sqlite3_stmt*>(statement));
+        if (sql && std::string(sql).find("FROM \"MIRVAE\"") != std::string::npos)
+          static_cast<std::set<std::string>*>(context)->insert(sql);
+        return 0;
+      },
+      &statements);
+  browser.listMonth();
+  sqlite3_trace_v2(db, 0, nullptr, nullptr);
+
+  bool scans = false, throughIndx1 = false;
+  std::cout << "Plans of the list's requests on MIRVAE:\n";
+  for (const std::string& sql : statements) {
+    std::cout << "  " << sql << "\n";
+    sqlite3_stmt* plan = nullptr;
+    std::string explain = "EXPLAIN QUERY PLAN " + sql;
+    if (sqlite3_prepare_v2(db, explain.c_str(), -1, &plan, nullptr) != SQLITE_OK)
+      throw host::HostError(sqlite3_errmsg(db));
+    while (sqlite3_step(plan) == SQLITE_ROW) {
+      std::string detail = reinterpret_cast<const char*>(sqlite3_column_text(plan, 3));
+      scans = scans || detail.rfind("SCAN", 0) == 0;
+      throughIndx1 = throughIndx1 || detail.find("MIRVAE_INDX1") != std::string::npos;
+      std::cout << "    -> " << detail << "\n";
+    }
+    sqlite3_finalize(plan);
+  }
+  std::cout << std::flush;
+  return throughIndx1 && !scans;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  bench::prepareProcess();
+  dossierOf(kSmall);
+  dossierOf(kLarge);
+  // The browser opens on no period: it lists every client invoice of the dossier.
+  // That is how the screen starts, not what the target is about, so it is only shown.
+  auto opening = [](long long count) {
+    auto start = std::chrono::steady_clock::now();
+    OpenBrowser& browser = browserOn(count);
+    std::chrono::duration<double> took = std::chrono::steady_clock::now() - start;
+    std::cout << "browser opened on no period in " << took.count() << " s, listing "
+              << model::lignes(browser.session).size() << " client invoices; peak memory so far "
+              << bench::peakMemoryKb() / 1024 << " MB\n";
+    return browser.listMonth();
+  };
+  std::size_t smallRows = opening(kSmall), largeRows = opening(kLarge);
+  std::cout << "client invoices of " << kMonth << ": " << smallRows << " (small dossier), " << largeRows
+            << " (large dossier)\n";
+  bool indexed = printPlans(browserOn(kLarge));
+  if (!indexed) std::cout << "WARNING: the list scans MIRVAE, or does not go through MIRVAE_INDX1\n";
+
+  bench::Figures figures;
+  if (!bench::run(argc, argv, figures, false)) return 1;
+  const std::string smallName = "BM_ListOneMonth/" + std::to_string(kSmall);
+  const std::string largeName = "BM_ListOneMonth/" + std::to_string(kLarge);
+  if (!figures.has(smallName) || !figures.has(largeName)) {
+    std::cout << "ratio: not measured (both sizes must run)\n";
+    return 1;
+  }
+  double small_ms = figures.seconds(smallName) * 1000 / static_cast<double>(kListings);
+  double large_ms = figures.seconds(largeName) * 1000 / static_cast<double>(kListings);
+  std::printf("one month listed: %.2f ms with %lld operations (%zu rows), %.2f ms with %lld operations (%zu rows); "
+              "spread of the repetitions %.0f %% / %.0f %%\n",
+              small_ms, kSmall, smallRows, large_ms, kLarge, largeRows, figures.spread(smallName) * 100,
+              figures.spread(largeName) * 100);
+  double ratio = large_ms / small_ms;
+  std::printf("ratio large/small: %.2f (target <= 1.5: %s%s)\n", ratio, ratio <= 1.5 ? "met" : "MISSED",
+              indexed ? "" : ", a request scans MIRVAE");
+  return 0;
+}
