@@ -75,6 +75,8 @@ void EntryScreen::modte_generer(Evt*) {
   MODLI.activeRequete();
   for (int rc = MODLI.suivant(3); rc == 0; rc = MODLI.suivant(1)) {
     if (madeByPosting(MODLI_COL_NUMCP)) continue;
+    // A read by key ignores a binding's request: whether the account is one the
+    // header or the lines may take is asked of the dossier with the lists' filters.
     if (*kind_.headerNature && readAccountOfNature(COMPT1, COMPT1_NUMCP, COMPT1_NATUC, COMPT1_CCTRA,
                                                   MODLI_COL_NUMCP.chaine(), kind_.headerNature)) {
       MIRVAE_NUMCP = COMPT1_NUMCP;
