@@ -245,7 +245,7 @@ void ScriptPlayer::expect(const Instruction& line) {
       return;
     }
     case Op::ExpectRows: {
-      std::size_t n = model::lignes(*session_).size();
+      std::size_t n = model::nombreLignes(*session_);
       if (n != std::stoul(a[0])) failLine(line, std::to_string(n) + " lignes dans la liste, attendu " + a[0]);
       return;
     }

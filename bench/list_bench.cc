@@ -92,7 +92,7 @@ struct OpenBrowser {
     if (!model::saisir(session, "VMOIAN", kMonth))
       throw host::HostError("période refusée : " + session.transcript().rendu());
     session.transcript().vider();
-    return model::lignes(session).size();
+    return model::nombreLignes(session);
   }
   bench::ValidatingUser user;
   host::Session session;
@@ -180,7 +180,7 @@ int main(int argc, char** argv) {
     OpenBrowser& browser = browserOn(count);
     std::chrono::duration<double> took = std::chrono::steady_clock::now() - start;
     std::cout << "browser opened on no period in " << took.count() << " s, listing "
-              << model::lignes(browser.session).size() << " client invoices; peak memory so far "
+              << model::nombreLignes(browser.session) << " client invoices; peak memory so far "
               << bench::peakMemoryKb() / 1024 << " MB\n";
     return browser.listMonth();
   };

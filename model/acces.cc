@@ -51,43 +51,87 @@ void Scritere::fill() {
   host::Table& main = *table(false);
   out_of_date_ = false;
   shown_.clear();
-  rows_.clear();
   selected_ = 0;
+  alias_ = main.alias();
+  columns_ = main.colonnes();
+  variables_.clear();
+  for (const host::Donnee* d : variables()) variables_.push_back(d->nom());
+  keyColumn_ = -1;
+  int keys = 0;
+  for (std::size_t i = 0; i < columns_.size(); ++i)
+    if (columns_[i].key && keys++ == 0) keyColumn_ = static_cast<int>(i);
+  if (keys != 1) keyColumn_ = -1;
+
   const std::string list = kList;
   for (int rc = main.suivant(3); rc == 0; rc = main.suivant(1)) {
     Outcome outcome = step(*this, list + "_SELECTION");
     if (outcome == Outcome::stopped) return;
     if (outcome == Outcome::refused) continue;
     Shown row;
-    for (const host::Colonne& c : main.colonnes()) {
-      host::Valeur v = main.valeur(c.name);
-      row.text[main.alias() + "." + c.name] = v.chaine();
-      row.text[c.name] = v.chaine();
-      if (c.key) row.keys.emplace_back(c.name, v);
+    for (std::size_t i = 0; i < columns_.size(); ++i) {
+      host::Valeur v = main.valeur(columns_[i].name);
+      row.values += v.chaine();
+      row.values += '\0';
+      if (static_cast<int>(i) == keyColumn_) row.key = std::move(v);
     }
-    // A variable shadows a field of the same bare name; "TABLE.FIELD" stays the field.
-    for (const host::Donnee* d : variables()) row.text[d->nom()] = d->chaine();
+    for (const host::Donnee* d : variables()) {
+      row.values += d->chaine();
+      row.values += '\0';
+    }
+    row.values.shrink_to_fit();
     shown_.push_back(std::move(row));
   }
-  for (const Shown& s : shown_) rows_.push_back(s.text);
+  shown_.shrink_to_fit();
   if (step(*this, list + (shown_.empty() ? "_LISTE_VIDE" : "_LISTE_PLEINE")) == Outcome::stopped) return;
   if (!shown_.empty()) selectRow(1);
 }
 
-void Scritere::selectRow(int n) {
+void Scritere::checkRow(int n) const {
   if (n < 1 || n > static_cast<int>(shown_.size()))
     throw host::HostError("la liste « " + std::string(kList) + " » n'a pas de ligne " + std::to_string(n));
+}
+
+RowText Scritere::row(int n) const {
+  checkRow(n);
+  const std::string& packed = shown_[n - 1].values;
+  RowText text;
+  std::size_t at = 0;
+  auto next = [&] {
+    std::size_t end = packed.find('\0', at);
+    std::string value = packed.substr(at, end - at);
+    at = end + 1;
+    return value;
+  };
+  for (const host::Colonne& c : columns_) {
+    std::string value = next();
+    text[alias_ + "." + c.name] = value;
+    text[c.name] = std::move(value);
+  }
+  // A variable shadows a field of the same bare name; "TABLE.FIELD" stays the field.
+  for (const std::string& name : variables_) text[name] = next();
+  return text;
+}
+
+std::vector<RowText> Scritere::rows() const {
+  std::vector<RowText> out;
+  out.reserve(shown_.size());
+  for (std::size_t n = 1; n <= shown_.size(); ++n) out.push_back(row(static_cast<int>(n)));
+  return out;
+}
+
+void Scritere::selectRow(int n) {
+  checkRow(n);
   host::Table& main = *table(false);
-  const Shown& row = shown_[n - 1];
-  if (row.keys.size() == 1) {
-    host::Champ key(row.keys[0].first.c_str(), &main);
-    if (main.lit(3, key, '=', row.keys[0].second) != 0)
+  if (keyColumn_ >= 0) {
+    host::Champ key(columns_[keyColumn_].name.c_str(), &main);
+    if (main.lit(3, key, '=', shown_[n - 1].key) != 0)
       throw host::HostError("la ligne " + std::to_string(n) + " de la liste n'existe plus dans « " + main.alias() + " »");
   } else {
     // Without a one-field key the row cannot be read again: its values are put back.
+    RowText text = row(n);
     main.raz();
-    for (const host::Colonne& c : main.colonnes())
-      main.affecter(c.name, host::Valeur::depuisTexte(c.genre, row.text.at(main.alias() + "." + c.name), c.name));
+    for (const host::Colonne& c : columns_)
+      main.affecter(c.name, host::Valeur::depuisTexte(c.genre, text.at(main.alias() + "." + c.name), c.name));
   }
   selected_ = n;
 }

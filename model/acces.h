@@ -24,6 +24,7 @@
 #include <string>
 #include <vector>
 
+#include "host/database.h"
 #include "host/value.h"
 #include "model/row_text.h"
 #include "model/traitecr.h"
@@ -43,8 +44,11 @@ class Scritere : public Traitecr {
   void refreshList();
   bool listOutOfDate() const { return out_of_date_; }
 
-  // Rows shown, in list order.
-  const std::vector<RowText>& rows() const { return rows_; }
+  // Rows shown, in list order; row(n) from 1. The text is made when asked for: a
+  // list keeps each row's values packed, so that a long list stays small.
+  std::size_t rowCount() const { return shown_.size(); }
+  RowText row(int n) const;
+  std::vector<RowText> rows() const;
   // Selects row n (from 1): the main table's buffer is read again on that row.
   // Throws HostError for a row the list does not show.
   void selectRow(int n);
@@ -59,15 +63,22 @@ class Scritere : public Traitecr {
   virtual bool startSteps();
 
  private:
+  // A row as filled: the main table's column values, then the variables' values,
+  // each ended by a NUL (in the order of columns_ and variables_), and the key that
+  // reads the row again when the table has a one-field primary key.
   struct Shown {
-    RowText text;
-    std::vector<std::pair<std::string, host::Valeur>> keys;  // primary key of the row
+    std::string values;
+    host::Valeur key;
   };
   void fill();
+  void checkRow(int n) const;
 
   bool out_of_date_ = true;
+  std::string alias_;                    // of the main table, at the last fill
+  std::vector<host::Colonne> columns_;   // of the main table, at the last fill
+  std::vector<std::string> variables_;   // names of the screen's variables, at the last fill
+  int keyColumn_ = -1;                   // the one-field key among columns_, or -1
   std::vector<Shown> shown_;
-  std::vector<RowText> rows_;
   int selected_ = 0;
 };
 

@@ -210,10 +210,16 @@ std::vector<RowText> lignes(Session& session) {
   throw HostError("l'écran « " + screen.code() + " » n'a pas de liste");
 }
 
+std::size_t nombreLignes(Session& session) {
+  Automate& screen = ecranDevant(session);
+  if (auto* list = dynamic_cast<Scritere*>(&screen)) return list->rowCount();
+  return lignes(session).size();
+}
+
 bool choisirLigne(Session& session, int n) {
   auto* list = dynamic_cast<Scritere*>(&ecranDevant(session));
   if (!list) throw HostError("l'écran « " + ecranDevant(session).code() + " » n'a pas de liste d'accès");
-  if (n < 1 || n > static_cast<int>(list->rows().size()))
+  if (n < 1 || n > static_cast<int>(list->rowCount()))
     throw HostError("la liste n'a pas de ligne " + std::to_string(n));
   return act(session, "action", "choisir la ligne " + std::to_string(n), "", [n](Automate& a) {
     static_cast<Scritere&>(a).selectRow(n);

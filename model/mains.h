@@ -60,6 +60,8 @@ bool abandonnerLigne(host::Session& session);
 
 // The list of the screen in front (an access list or a document's lines).
 std::vector<RowText> lignes(host::Session& session);
+// How many rows that list shows, without making their text.
+std::size_t nombreLignes(host::Session& session);
 // Selects row n (from 1) of an access list.
 bool choisirLigne(host::Session& session, int n);
 
