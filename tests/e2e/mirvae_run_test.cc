@@ -17,8 +17,9 @@ struct Outcome {
   std::string out;  // standard output and error together
 };
 
-Outcome mirvae(const std::string& args) {
-  std::string command = std::string("'") + MIRVAE_BINARY + "' " + args + " 2>&1";
+// Runs a shell command and keeps what it printed.
+Outcome run(const std::string& command_line) {
+  std::string command = command_line + " 2>&1";
   FILE* pipe = ::popen(command.c_str(), "r");
   if (!pipe) return {-1, "popen"};
   std::string out;
@@ -27,6 +28,8 @@ Outcome mirvae(const std::string& args) {
   int status = ::pclose(pipe);
   return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, out};
 }
+
+Outcome mirvae(const std::string& args) { return run(std::string("'") + MIRVAE_BINARY + "' " + args); }
 
 std::string quote(const std::string& path) { return "'" + path + "'"; }
 
@@ -113,6 +116,21 @@ TEST_F(MirvaeRunTest, TheDemoMakesItsDossierAndNeverReplacesAnotherFile) {
   // Played again, it starts from a fresh dossier: same result.
   Outcome again = mirvae("demo --dossier " + quote(other_));
   EXPECT_EQ(again.status, 0) << again.out;
+
+  // Its ledger, exported, is a journal hledger accepts, and every piece balances.
+  std::string journal = other_ + ".journal";
+  Outcome exported = mirvae("export " + quote(other_) + " --format hledger -o " + quote(journal));
+  EXPECT_EQ(exported.status, 0) << exported.out;
+  if (std::system("command -v hledger >/dev/null 2>&1") == 0) {
+    Outcome check = run("hledger -f " + quote(journal) + " check");
+    EXPECT_EQ(check.status, 0) << check.out;
+    Outcome balance = run("hledger -f " + quote(journal) + " balance --no-elide");
+    EXPECT_EQ(balance.status, 0) << balance.out;
+    // The last line is the grand total: nothing, when debits and credits match.
+    std::string total = balance.out.substr(balance.out.find_last_of('-') + 1);
+    EXPECT_EQ(total.find_first_not_of(" \n0"), std::string::npos) << balance.out;
+  }
+  std::filesystem::remove(journal);
 
   std::filesystem::remove(other_);
   std::ofstream(other_) << "mes notes\n";

@@ -6,6 +6,8 @@
 #include <gtest/gtest.h>
 
 #include "host/registry.h"
+#include "model/impetat.h"
+#include "model/impression.h"
 #include "tests/entry/gestion1_fixture.h"
 
 namespace {
@@ -109,6 +111,28 @@ TEST_F(DocumentTest, SavingAndCreatingANewPieceKeepsTheEntryModel) {
   EXPECT_EQ(ecran().identifiantDocument(), "");
   EXPECT_EQ(valeur("MIRVAE.NPIEC"), "[PIECE]");
   EXPECT_EQ(valeur("V_CMODEL"), "VTPOSE");
+}
+
+// The client invoice form is printed by a job of the tests' own until the real one
+// is part of the library: one printed line per saved operation.
+struct FormeFacture : model::Edition_etat2 {
+  explicit FormeFacture(host::Evt* e) : Edition_etat2(e) { nomTable("MIRVAE", nullptr); }
+};
+
+TEST_F(DocumentTest, SavingAndPrintingPrintsTheFormOfTheSavedOperation) {
+  if (!host::Registre::instance().module("MIRVAE-IMPR_FICHE1"))
+    host::Module("", "MIRVAE-IMPR_FICHE1", &host::fabriquer<FormeFacture>, false, "");
+  model::Imprimante::courante().vider();
+  ASSERT_TRUE(facture());
+  enregistrer("3");
+  ASSERT_EQ(nombre("SELECT count(*) FROM MIRVAE"), 1);
+  EXPECT_FALSE(sql("SELECT NPIES FROM MIRVAE").empty());
+  const auto& printed = model::Imprimante::courante().impressions();
+  ASSERT_EQ(printed.size(), 1u);
+  EXPECT_EQ(printed[0].module, "MIRVAE-IMPR_FICHE1");
+  EXPECT_NE(printed[0].requete.find("'" + sql("SELECT IDENT FROM MIRVAE") + "'"), std::string::npos)
+      << printed[0].requete;
+  EXPECT_EQ(valeur("V_IMPR_FICHE"), "0");
 }
 
 TEST_F(DocumentTest, ModificationIsRefusedForAnOldDateOrAPieceThatCanNoLongerChange) {
