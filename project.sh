@@ -5,6 +5,7 @@
 #   ./project.sh demo [ARGS...]   build, then run `mirvae demo ARGS...`
 #   ./project.sh test             build normally and under ASan+UBSan, run every test in both
 #   ./project.sh build            build the normal tree only (build/)
+#   ./project.sh bench [NAME...]  build, then run the benchmarks (bench/README.md): posting, list, memory
 set -euo pipefail
 cd "$(dirname "$0")"
 
@@ -43,6 +44,15 @@ case "$command" in
   build)
     build build
     ;;
+  bench)
+    build build
+    names=("$@")
+    [ ${#names[@]} -gt 0 ] || names=(posting list memory)
+    for name in "${names[@]}"; do
+      echo "== ${name}_bench"
+      ./build/bench/"${name}"_bench
+    done
+    ;;
   test)
     build build
     (cd build && ctest --output-on-failure -j "$(nproc)")
@@ -50,7 +60,7 @@ case "$command" in
     (cd build-asan && ASAN_OPTIONS=detect_leaks=1 UBSAN_OPTIONS=print_stacktrace=1 ctest --output-on-failure -j "$(nproc)")
     ;;
   *)
-    echo "usage: $0 demo|test|build" >&2
+    echo "usage: $0 demo|test|build|bench" >&2
     exit 2
     ;;
 esac
