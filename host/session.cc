@@ -124,8 +124,14 @@ void Session::tableDeTravail(const std::string& name) {
 
 bool Session::action(const std::function<void()>& act) {
   if (action_depth_ > 0) {
+    // An action played inside another (a modal screen's) belongs to its unit: its
+    // failure undoes the whole unit, but it answers for itself only.
+    bool failed_before = failed_;
+    failed_ = false;
     act();
-    return !failed_;
+    bool ok = !failed_;
+    failed_ = failed_ || failed_before;
+    return ok;
   }
   ++action_depth_;
   failed_ = false;

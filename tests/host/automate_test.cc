@@ -113,6 +113,18 @@ TEST_F(AutomateTest, HostErrorIsStampedWithItsEventAndUndoesTheAction) {
   EXPECT_EQ(sql("SELECT count(*) FROM NDOC WHERE NOM = 'ESSAI'"), "0");
 }
 
+TEST_F(AutomateTest, ActionsInsideAnotherAnswerForThemselvesAndAFailureUndoesTheWhole) {
+  std::vector<bool> inner;
+  bool ok = session().action([&] {
+    base().exec("INSERT INTO NDOC (NOM, DERNIER) VALUES ('ESSAI', 1)");
+    inner.push_back(session().action([&] { lanceur_->executer("CASSER", nullptr); }));
+    inner.push_back(session().action([&] { lanceur_->executer("AGIR", nullptr); }));
+  });
+  EXPECT_EQ(inner, (std::vector<bool>{false, true}));
+  EXPECT_FALSE(ok);
+  EXPECT_EQ(sql("SELECT count(*) FROM NDOC WHERE NOM = 'ESSAI'"), "0");
+}
+
 TEST_F(AutomateTest, BadNamesAndIndexesAreClearErrors) {
   EXPECT_THROW(lanceur_->executer("INCONNUE", nullptr), HostError);
   EXPECT_THROW(Registre::instance().creer("MIRVAE-NEANT", nullptr), HostError);
