@@ -334,12 +334,7 @@ void EntryScreen::debut_fiche(Evt* e) {
   lireJournal();
   procedure("SAISIE_MTT");
   lireOuVider(PIECE, PIECE_NPIES, MIRVAE_NPIES);
-  Chaine devise(MIRVAE_MONNAIE_IDENT.chaine());
-  Date date(MIRVAE_DTOPE.jour());
-  Double taux(0);
-  Chaine options("DB");
-  EvtParamRef bascule(4, &devise, &date, &taux, &options);
-  procedure("CTRL_BASCULER", &bascule);
+  switchCurrency("DB");
   procedure("CALCUL_TOTAUX");
 }
 

@@ -87,17 +87,34 @@ void EntryScreen::cours(Evt*) {
   ecran()->affiche("COURS", "");
 }
 
-// Parameters: currency (empty: the service's current one), date of the rate, rate
-// (0: the rate of that day), option letters.
+namespace {
+
+// The parameters of the currency switch and of the steps it runs, read as locals of
+// the screen: currency (empty: the service's current one), date of the rate, rate (0:
+// the rate of that day), option letters. PIDENT is also the screen's launch
+// parameter: the currency goes by another name here.
+struct SwitchParameters {
+  SwitchParameters(Automate* screen, Evt* e)
+      : devise("PIDENT", "", "", 4, screen),
+        PDATE("PDATE", "", "", 4, screen),
+        PCOURS("PCOURS", "", "", 4, screen),
+        PINFOS("PINFOS", "", "", 4, screen) {
+    e->param(0, devise, 0);
+    e->param(1, PDATE, 0);
+    e->param(2, PCOURS, 0);
+    e->param(3, PINFOS, 0);
+  }
+  Chaine devise;
+  Date PDATE;
+  Double PCOURS;
+  Chaine PINFOS;
+};
+
+}  // namespace
+
 void EntryScreen::ctrl_basculer(Evt* e) {
-  // PIDENT is also the screen's launch parameter: the local goes by another name here.
-  Chaine devise("PIDENT", "", "", 4, this), PINFOS("PINFOS", "", "", 4, this);
-  Date PDATE("PDATE", "", "", 4, this);
-  Double PCOURS("PCOURS", "", "", 4, this);
-  e->param(0, devise, 0);
-  e->param(1, PDATE, 0);
-  e->param(2, PCOURS, 0);
-  e->param(3, PINFOS, 0);
+  SwitchParameters p(this, e);
+  auto& [devise, PDATE, PCOURS, PINFOS] = p;
   Devises& devises = euro();
   if (devise.estVide()) devise = devises.courante();
   ecran()->affiche("MONNAIE_IDENT", "TBL_MONNAIE", "");
@@ -110,7 +127,7 @@ void EntryScreen::ctrl_basculer(Evt* e) {
   EvtParamRef bascule(4, &devise, &PDATE, &PCOURS, &PINFOS);
   Automate::ctrl_basculer(&bascule);
   int refused = erreurMethode();
-  // Declined or refuseded, the switch left the service as it was: the header shows
+  // Declined or refused, the switch left the service as it was: the header shows
   // the currency and rate the document keeps.
   MIRVAE_MONNAIE_IDENT = devises.courante();
   if (refused == 0) PCOURS = devises.coursCourant();
@@ -124,13 +141,8 @@ void EntryScreen::ctrl_basculer(Evt* e) {
 }
 
 void EntryScreen::ctrl_actualiser_mode(Evt* e) {
-  Chaine devise("PIDENT", "", "", 4, this), PINFOS("PINFOS", "", "", 4, this);
-  Date PDATE("PDATE", "", "", 4, this);
-  Double PCOURS("PCOURS", "", "", 4, this);
-  e->param(0, devise, 0);
-  e->param(1, PDATE, 0);
-  e->param(2, PCOURS, 0);
-  e->param(3, PINFOS, 0);
+  SwitchParameters p(this, e);
+  auto& [devise, PDATE, PCOURS, PINFOS] = p;
   if (!enVisualisation() && lineInEntry()) return erreurMethode(1, e);
 
   Devises& devises = euro();

@@ -171,12 +171,7 @@ void EntryScreen::importation_lignes(Evt*) {
   procedure("RENUMEROTE_LIGNES");
   ecran()->affiche("LST", "");
   procedure("CALCUL_TOTAUX");
-  Chaine monnaie(MIRVAE_MONNAIE_IDENT.chaine());
-  Date date(MIRVAE_DTOPE.jour());
-  Double taux(0);
-  Chaine options("DB");
-  EvtParamRef bascule(4, &monnaie, &date, &taux, &options);
-  procedure("CTRL_BASCULER", &bascule);
+  switchCurrency("DB");
 }
 
 // The analytic rows of source line `source` for the new line in MIRVAL. When the
