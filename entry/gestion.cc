@@ -306,6 +306,11 @@ void EntryScreen::apres_debut_creation(Evt* e) {
 
 void EntryScreen::fin_creation(Evt* e) {
   Saisie::fin_creation(e);
+  // The copy is saved: the creation that follows is a new piece, not the same
+  // operation duplicated once more.
+  IDENT_ORIGINE = "";
+  MONNAIE_ORIGINE = "";
+  COURS_ORIGINE = 0;
   if (V_CREAT_ACTIF == 1) {
     V_CREAT_ACTIF = 0;
     enFile("CREATION");

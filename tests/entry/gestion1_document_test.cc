@@ -224,6 +224,14 @@ TEST_F(DocumentTest, DuplicatingStartsACreationWithoutPieceNumbers) {
   EXPECT_EQ(valeur("MIRVAE.NPIES"), "");
   EXPECT_EQ(valeur("MIRVAE.INPIE"), "Facture client n° VT1");
   EXPECT_EQ(valeur("VLIBCP1"), "Brasserie Lissandre");
+
+  // Saved, the copy is done with: the creation that follows starts empty.
+  enregistrer("1");
+  EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE"), 2);
+  EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAL"), 4);
+  EXPECT_EQ(mode(), "C");
+  EXPECT_EQ(valeur("IDENT_ORIGINE"), "");
+  EXPECT_EQ(model::lignes(session()).size(), 0u);
 }
 
 }  // namespace
