@@ -411,6 +411,11 @@ void EntryScreen::apres_validation(Evt* e) {
   bool remplace = !MIRVAE_NPIES.estVide() && lireOuVider(PIECE, PIECE_NPIES, MIRVAE_NPIES);
   EvtParamVal suppression(2, &MIRVAE_NPIES, "N");
   appelerModule("", "MIRVAE", "SUPPRIMER_PIECE", &suppression);
+  // A piece the ledger would not let go (matched, settled, or held by another user
+  // since the modification began) must not be posted a second time beside it.
+  if (remplace && lireOuVider(PIECE, PIECE_NPIES, MIRVAE_NPIES))
+    throw HostError("La pièce comptable " + MIRVAE_NPIES.chaine() +
+                    " n'a pas pu être supprimée : la modification n'est pas enregistrée.");
   Chaine VIDENT("VIDENT", "", "", 4, this);
   VIDENT = MIRVAE_IDENT;
   EvtParamVal comptabilisation(1, &MIRVAE_IDENT);
@@ -435,9 +440,16 @@ void EntryScreen::avant_suppression(Evt* e) {
     messageOk("Cette pièce est validée définitivement.@La suppression est impossible !");
     return;
   }
-  Saisie::avant_suppression(e);
   EvtParamVal suppression(2, &MIRVAE_NPIES, "N");
   appelerModule("", "MIRVAE", "SUPPRIMER_PIECE", &suppression);
+  // The operation goes only with its piece: one the ledger keeps (matched, settled,
+  // or held by another user) would stay in the books without its operation.
+  if (!MIRVAE_NPIES.estVide() && lireOuVider(PIECE, PIECE_NPIES, MIRVAE_NPIES)) {
+    messageOk("La pièce comptable " + MIRVAE_NPIES.chaine() +
+              " n'a pas pu être supprimée de la comptabilité.@La suppression est impossible !");
+    return;
+  }
+  Saisie::avant_suppression(e);
 }
 
 // ---------------------------------------------------------------------------- data steps of the save

@@ -273,6 +273,28 @@ TEST_F(ReplacementTest, ASaveWhoseLineCannotBeValidatedChangesNothing) {
   expectUnchanged();
 }
 
+TEST_F(ReplacementTest, APieceMatchedMeanwhileIsNeitherRemovedNorPostedTwice) {
+  facturePosteeEnModification();
+  // Another user letters the client's movement while the operation is being changed.
+  sql("UPDATE MOUVE SET RELET = 'AA' WHERE NUMCP = '411001'");
+  ASSERT_TRUE(model::allerLigne(session(), 2));
+  ASSERT_TRUE(saisir("LST_V_HT", "120"));
+  ASSERT_TRUE(model::validerLigne(session()));
+  EXPECT_FALSE(appuyer("B_VALID_DOC"));
+  expectUnchanged();
+  EXPECT_EQ(nombre("SELECT count(*) FROM PIECE"), 1);
+}
+
+TEST_F(ReplacementTest, AnOperationWhosePieceTheLedgerKeepsIsNotDeleted) {
+  std::string ident = facturePosteeEnModification();
+  sql("UPDATE MOUVE SET RELET = 'AA' WHERE NUMCP = '411001'");
+  EXPECT_FALSE(appuyer("SUPPRESSION"));
+  EXPECT_EQ(dernierMessage(), "La pièce comptable " + npies_ +
+                                  " n'a pas pu être supprimée de la comptabilité.@La suppression est impossible !");
+  expectUnchanged();
+  EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE WHERE IDENT = '" + ident + "'"), 1);
+}
+
 TEST_F(ReplacementTest, ASaveWhoseNewPieceTheLedgerRefusesKeepsTheOldPiece) {
   facturePosteeEnModification();
   // The ledger no longer knows the VAT accounts: the new piece is refused.
