@@ -54,12 +54,16 @@ void Scritere::fill() {
   selected_ = 0;
   alias_ = main.alias();
   columns_ = main.colonnes();
+  // The variables are the screen's own: no handler's local lives between rows.
+  const std::vector<host::Donnee*> shownVariables = variables();
   variables_.clear();
-  for (const host::Donnee* d : variables()) variables_.push_back(d->nom());
-  keyColumn_ = -1;
+  for (const host::Donnee* d : shownVariables) variables_.push_back(d->nom());
   int keys = 0;
   for (std::size_t i = 0; i < columns_.size(); ++i)
-    if (columns_[i].key && keys++ == 0) keyColumn_ = static_cast<int>(i);
+    if (columns_[i].key) {
+      ++keys;
+      keyColumn_ = static_cast<int>(i);
+    }
   if (keys != 1) keyColumn_ = -1;
 
   const std::string list = kList;
@@ -74,7 +78,7 @@ void Scritere::fill() {
       row.values += '\0';
       if (static_cast<int>(i) == keyColumn_) row.key = std::move(v);
     }
-    for (const host::Donnee* d : variables()) {
+    for (const host::Donnee* d : shownVariables) {
       row.values += d->chaine();
       row.values += '\0';
     }
@@ -131,7 +135,7 @@ void Scritere::selectRow(int n) {
     RowText text = row(n);
     main.raz();
     for (const host::Colonne& c : columns_)
-      main.affecter(c.name, host::Valeur::depuisTexte(c.genre, text.at(main.alias() + "." + c.name), c.name));
+      main.affecter(c.name, host::Valeur::depuisTexte(c.genre, text.at(alias_ + "." + c.name), c.name));
   }
   selected_ = n;
 }
