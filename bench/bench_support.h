@@ -28,7 +28,6 @@
 #include "host/session.h"
 #include "registry/dossier.h"
 #include "registry/library.h"
-#include "services/cppiece.h"
 
 namespace bench {
 
@@ -56,7 +55,6 @@ inline std::chrono::year_month_day today() {
 // Loads the library and fixes the clock; once per process.
 inline void prepareProcess() {
   registry::chargerBibliotheque();
-  services::chargerGrandLivre();
   host::clock::setToday(today());
   host::clock::setTimeOfDay("10:30:00");
 }

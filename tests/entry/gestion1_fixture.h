@@ -10,19 +10,12 @@
 #include "host/table.h"
 #include "model/mains.h"
 #include "model/traitmnt.h"
-#include "services/cppiece.h"
 #include "tests/support/fixture.h"
 
 namespace testing_support {
 
 class Gestion1Test : public DossierTest {
  protected:
-  void SetUp() override {
-    DossierTest::SetUp();
-    // Saving posts the operation through the ledger's import component.
-    services::chargerGrandLivre();
-  }
-
   // Opens a new creation, as from the menu.
   bool creer() { return model::ouvrir(session(), "MIRVAE-GESTION1"); }
 
