@@ -2,6 +2,7 @@
 
 #include "host/error.h"
 #include "host/session.h"
+#include "model/interface.h"
 
 namespace browser {
 
@@ -333,7 +334,7 @@ void MIRVAEAcces::creer(Evt*) {
 
 void MIRVAEAcces::impr_fiche(Evt*) {
   Chaine V_REQUETE("V_REQUETE", "", "", 4, nullptr);
-  V_REQUETE = "Select * From TABLE Where IDENT = '" + IDENT + "'";
+  V_REQUETE = model::requeteFiche(IDENT.chaine());
   Chaine name(genre_.fiche());
   EvtParamRef evt(2, &name, &V_REQUETE);
   appelerProcedure("*", "MIRVAE", "INTERFACE", "IMPRESSION", &evt, -1);

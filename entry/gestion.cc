@@ -5,6 +5,7 @@
 #include "host/currency.h"
 #include "host/error.h"
 #include "host/session.h"
+#include "model/interface.h"
 
 namespace entry {
 
@@ -216,13 +217,8 @@ void EntryScreen::completer_info_fiche(Evt*) {}
 void EntryScreen::imprime(Evt*) { procedure("IMPR_FICHE"); }
 
 void EntryScreen::impr_fiche(Evt*) {
-  // The print procedure takes its request as SQL text. The identifier is the
-  // system's own, but a quote in it must still not end the literal.
-  std::string ident = MIRVAE_IDENT.chaine();
-  for (std::size_t at = ident.find('\''); at != std::string::npos; at = ident.find('\'', at + 2))
-    ident.insert(at, 1, '\'');
   Chaine V_REQUETE("V_REQUETE", "", "", 4, this);
-  V_REQUETE = "Select * From TABLE Where IDENT = '" + ident + "'";
+  V_REQUETE = model::requeteFiche(MIRVAE_IDENT.chaine());
   EvtParamVal impression(2, kind_.printForm, &V_REQUETE);
   appelerProcedure("*", "MIRVAE", "INTERFACE", "IMPRESSION", &impression, -1);
 }

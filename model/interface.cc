@@ -7,6 +7,12 @@
 
 namespace model {
 
+std::string requeteFiche(const std::string& ident) {
+  std::string literal;
+  for (char c : ident) literal += c == '\'' ? std::string("''") : std::string(1, c);
+  return "Select * From TABLE Where IDENT = '" + literal + "'";
+}
+
 Interface2::Interface2(Evt* e) : Interface(e) {
   addBaseBranch("IMPRESSION", [this](Evt* ev) { impression(ev); });
 }

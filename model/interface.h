@@ -17,6 +17,11 @@ namespace model {
 
 using namespace host;
 
+// The request of a form printing one record: "Select * From TABLE Where IDENT = '...'"
+// with the identifier as an SQL literal (a quote in it doubled, so that it cannot end
+// the literal).
+std::string requeteFiche(const std::string& ident);
+
 class Interface : public Automate {
  public:
   explicit Interface(Evt* e) : Automate(e) {}

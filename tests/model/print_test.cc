@@ -122,6 +122,13 @@ TEST_F(PrintTest, AFormPrintsItsRecordAndTheRecordsLines) {
                             }));
 }
 
+TEST_F(PrintTest, AFormRequestKeepsAQuoteInsideItsIdentifier) {
+  base().exec("INSERT INTO MIRVAE (IDENT, TYPE, NUMCP) VALUES ('D''3', 'FC', '411003')");
+  ASSERT_TRUE(imprimer("fiche1", model::requeteFiche("D'3")));
+  EXPECT_EQ(model::Imprimante::courante().derniere().lignes,
+            std::vector<std::string>{"fiche D'3 | VNOM=Client 411003 | VLIBCP="});
+}
+
 TEST_F(PrintTest, AListPrintsOneLinePerRowOfTheRequest) {
   ASSERT_TRUE(imprimer("liste1", "Select * From \"MIRVAE\" Where TYPE = 'FC' Order By IDENT Desc"));
   EXPECT_EQ(model::Imprimante::courante().derniere().lignes,
