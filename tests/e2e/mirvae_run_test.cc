@@ -96,14 +96,6 @@ TEST_F(MirvaeRunTest, AMissingScriptOrDossierIsRefused) {
   EXPECT_NE(mirvae("run /nonexistent/dossier.db " + quote(script_)).status, 0);
 }
 
-TEST_F(MirvaeRunTest, HelpWorksOnEveryCommand) {
-  for (const char* command : {"", "init", "modules", "run", "demo", "ledger", "export"}) {
-    Outcome help = mirvae(std::string(command) + " --help");
-    EXPECT_EQ(help.status, 0) << command << "\n" << help.out;
-    EXPECT_NE(help.out.find("--help"), std::string::npos) << command << "\n" << help.out;
-  }
-}
-
 TEST_F(MirvaeRunTest, TheDemoMakesItsDossierAndNeverReplacesAnotherFile) {
   other_ = testing_support::cheminTemporaire("mirvae-demo");
   // The demo holds its own expectations: the invoice, its modification and the

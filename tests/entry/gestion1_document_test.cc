@@ -120,8 +120,7 @@ struct FormeFacture : model::Edition_etat2 {
 };
 
 TEST_F(DocumentTest, SavingAndPrintingPrintsTheFormOfTheSavedOperation) {
-  if (!host::Registre::instance().module("MIRVAE-IMPR_FICHE1"))
-    host::Module("", "MIRVAE-IMPR_FICHE1", &host::fabriquer<FormeFacture>, false, "");
+  testing_support::moduleDeTest<FormeFacture>("MIRVAE-IMPR_FICHE1");
   model::Imprimante::courante().vider();
   ASSERT_TRUE(facture());
   enregistrer("3");

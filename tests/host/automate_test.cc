@@ -53,12 +53,8 @@ class AutomateTest : public testing_support::DossierTest {
   void SetUp() override {
     DossierTest::SetUp();
     journal.clear();
-    static bool registered = false;
-    if (!registered) {
-      registered = true;
-      Module("", "TEST-APPELE", &fabriquer<Appele>, false, "");
-      Module("", "TEST-LANCEUR", &fabriquer<Lanceur>, false, "");
-    }
+    testing_support::moduleDeTest<Appele>("TEST-APPELE");
+    testing_support::moduleDeTest<Lanceur>("TEST-LANCEUR");
     lanceur_ = Registre::instance().creer("TEST-LANCEUR", nullptr);
   }
   void TearDown() override {

@@ -17,24 +17,6 @@ std::string txt(const Decimal& d) { return d.toString(0); }
 
 using CurrencyTest = testing_support::DossierTest;
 
-TEST_F(CurrencyTest, KnowsEachCurrencyOfTheDossier) {
-  struct Case {
-    const char* ident;
-    int decimals;
-    bool zone, reference, fixed;
-  };
-  for (Case c : {Case{"EUR", 2, true, true, true}, Case{"FRF", 2, true, false, true},
-                 Case{"USD", 2, false, false, false}, Case{"JPY", 0, false, false, false},
-                 Case{"XPF", 0, false, false, true}}) {
-    SCOPED_TRACE(c.ident);
-    EXPECT_EQ(euro().decimales(c.ident), c.decimals);
-    EXPECT_EQ(euro().estZoneEuro(c.ident), c.zone);
-    EXPECT_EQ(euro().estReference(c.ident), c.reference);
-    EXPECT_EQ(euro().estCoursFixe(c.ident), c.fixed);
-  }
-  EXPECT_EQ(euro().tenue(), "EUR");
-}
-
 TEST_F(CurrencyTest, RateIsTheLatestOnOrBeforeTheDay) {
   struct Case {
     const char* ident;

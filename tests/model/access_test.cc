@@ -95,12 +95,8 @@ class AccesTest : public testing_support::DossierTest {
  protected:
   void SetUp() override {
     DossierTest::SetUp();
-    static bool registered = false;
-    if (!registered) {
-      registered = true;
-      Module("", "TEST-MODELE_ACCES", &fabriquer<ListeTest>, false, "");
-      Module("", "TEST-MODELE_ECRAN", &fabriquer<EcranLibre>, false, "");
-    }
+    testing_support::moduleDeTest<ListeTest>("TEST-MODELE_ACCES");
+    testing_support::moduleDeTest<EcranLibre>("TEST-MODELE_ECRAN");
     journal.clear();
     quitAt.clear();
     base().exec(

@@ -155,11 +155,7 @@ class DocumentCycleTest : public testing_support::DossierTest {
  protected:
   void SetUp() override {
     DossierTest::SetUp();
-    static bool registered = false;
-    if (!registered) {
-      registered = true;
-      Module("", "TEST-MODELE_DOCUMENT", &fabriquer<DocumentTest>, false, "");
-    }
+    testing_support::moduleDeTest<DocumentTest>("TEST-MODELE_DOCUMENT");
     journal.clear();
     consignes = Consignes();
   }

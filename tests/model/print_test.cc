@@ -73,14 +73,10 @@ class PrintTest : public testing_support::DossierTest {
  protected:
   void SetUp() override {
     DossierTest::SetUp();
-    static bool registered = false;
-    if (!registered) {
-      registered = true;
-      Module("", "TEST-TRAITEMENT", &fabriquer<Traitement>, false, "");
-      Module("", "TEST-IMPR_FICHE1", &fabriquer<Fiche>, false, "");
-      Module("", "TEST-IMPR_LISTE1", &fabriquer<Liste>, false, "");
-      Module("", "TEST-INTERFACE", &fabriquer<Interface>, false, "");
-    }
+    testing_support::moduleDeTest<Traitement>("TEST-TRAITEMENT");
+    testing_support::moduleDeTest<Fiche>("TEST-IMPR_FICHE1");
+    testing_support::moduleDeTest<Liste>("TEST-IMPR_LISTE1");
+    testing_support::moduleDeTest<Interface>("TEST-INTERFACE");
     journal.clear();
     quitAtDebut = false;
     model::Imprimante::courante().vider();

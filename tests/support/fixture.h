@@ -9,6 +9,7 @@
 #include <string>
 
 #include "host/clock.h"
+#include "host/registry.h"
 #include "host/session.h"
 #include "registry/dossier.h"
 
@@ -18,6 +19,13 @@ namespace testing_support {
 inline std::chrono::year_month_day jourDeTest() {
   using namespace std::chrono;
   return year_month_day{year(2024), month(3), day(15)};
+}
+
+// Registers a module of the tests' own under `name`, unless a module has that name
+// already: the registry lives as long as the process, fixtures as long as a test.
+template <typename T>
+void moduleDeTest(const char* name) {
+  if (!host::Registre::instance().module(name)) host::Module("", name, &host::fabriquer<T>, false, "");
 }
 
 // A unique file name in the temporary directory.
