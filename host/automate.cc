@@ -5,6 +5,7 @@
 #include "host/currency.h"
 #include "host/error.h"
 #include "host/session.h"
+#include "host/snapshot.h"
 #include "host/table.h"
 
 namespace host {
@@ -200,6 +201,15 @@ void Automate::convertAmounts(const std::function<Decimal(const Decimal&)>& conv
 }
 
 // ---------------------------------------------------------------------------- declarations
+
+void Automate::keepState(Snapshot& snapshot) {
+  for (Donnee* d : variables_) d->keepState(snapshot);
+  for (Table* t : tables_) t->keepState(snapshot);
+  snapshot.keep(screen_);
+  snapshot.keep(error_code_);
+  snapshot.keep(refused_);
+  snapshot.keep(ended_);
+}
 
 void Automate::declarerVariable(Donnee* d) { variables_.push_back(d); }
 

@@ -29,6 +29,7 @@
 namespace host {
 
 class Session;
+class Snapshot;
 class Table;
 
 class Automate {
@@ -146,6 +147,15 @@ class Automate {
   const std::vector<Table*>& tables() const { return tables_; }
 
   Session& session() const;
+
+  // Keeps what a user action may change in this automaton (variables, tables, screen
+  // state, results) so that a failed action can put it back. A class that keeps state
+  // in members of its own adds them, after its base's.
+  virtual void keepState(Snapshot& snapshot);
+  // Runs for each procedure library of the session before the user action's unit
+  // commits: a library ends there what the action began and left unfinished. The
+  // base does nothing.
+  virtual void endOfUnit() {}
 
  protected:
   // The model library's answer to a standard event; an own branch of the same

@@ -3,6 +3,7 @@
 #include "host/clock.h"
 #include "host/error.h"
 #include "host/session.h"
+#include "host/snapshot.h"
 
 namespace host {
 
@@ -139,6 +140,15 @@ Devises& euro() {
   std::shared_ptr<Devises>& service = session.devises();
   if (!service) service = std::make_shared<Devises>(session);
   return *service;
+}
+
+void Devises::keepState(Snapshot& snapshot) {
+  snapshot.keep(current_);
+  snapshot.keep(current_rate_);
+  snapshot.keep(current_day_);
+  snapshot.keep(source_);
+  snapshot.keep(cible_);
+  snapshot.keep(typed_);
 }
 
 }  // namespace host

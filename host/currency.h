@@ -27,6 +27,7 @@
 namespace host {
 
 class Session;
+class Snapshot;
 
 class Devises {
  public:
@@ -79,6 +80,10 @@ class Devises {
   void definirBascule(std::string_view source, std::string_view cible);
   const std::string& source() const { return source_; }
   const std::string& cible() const { return cible_; }
+
+  // Keeps the current currency, the conversion pair and the typed rates for a failed
+  // action to put back.
+  void keepState(Snapshot& snapshot);
 
  private:
   struct Facts {

@@ -2,6 +2,7 @@
 
 #include <sqlite3.h>
 
+#include <cstdint>
 #include <filesystem>
 
 #include "host/error.h"
@@ -41,6 +42,10 @@ Genre genreOf(const std::string& declared) {
   return Genre::Texte;
 }
 
+void rowHashFunction(sqlite3_context* context, int count, sqlite3_value** values) {
+  sqlite3_result_int64(context, empreinteLigne(values, count));
+}
+
 sqlite3* openFile(const std::string& path, int flags) {
   sqlite3* db = nullptr;
   if (sqlite3_open_v2(path.c_str(), &db, flags, nullptr) != SQLITE_OK) {
@@ -50,10 +55,52 @@ sqlite3* openFile(const std::string& path, int flags) {
   }
   sqlite3_busy_timeout(db, 10000);
   sqlite3_extended_result_codes(db, 1);
+  sqlite3_create_function(db, "empreinte_ligne", -1, SQLITE_UTF8 | SQLITE_DETERMINISTIC, nullptr, rowHashFunction,
+                          nullptr, nullptr);
   return db;
 }
 
 }  // namespace
+
+long long empreinteLigne(sqlite3_value** values, int count) {
+  // FNV-1a over each value's type and bytes; a value's type is read before anything
+  // else, and no accessor used here converts a value to another type.
+  std::uint64_t hash = 14695981039346656037ull;
+  auto mix = [&hash](const void* data, std::size_t size) {
+    const auto* bytes = static_cast<const unsigned char*>(data);
+    for (std::size_t i = 0; i < size; ++i) hash = (hash ^ bytes[i]) * 1099511628211ull;
+  };
+  for (int i = 0; i < count; ++i) {
+    unsigned char type = static_cast<unsigned char>(sqlite3_value_type(values[i]));
+    mix(&type, 1);
+    switch (type) {
+      case SQLITE_INTEGER: {
+        sqlite3_int64 n = sqlite3_value_int64(values[i]);
+        mix(&n, sizeof n);
+        break;
+      }
+      case SQLITE_FLOAT: {
+        double d = sqlite3_value_double(values[i]);
+        mix(&d, sizeof d);
+        break;
+      }
+      case SQLITE_TEXT: {
+        const unsigned char* text = sqlite3_value_text(values[i]);
+        mix(text, static_cast<std::size_t>(sqlite3_value_bytes(values[i])));
+        break;
+      }
+      case SQLITE_BLOB: {
+        const void* blob = sqlite3_value_blob(values[i]);
+        mix(blob, static_cast<std::size_t>(sqlite3_value_bytes(values[i])));
+        break;
+      }
+      default: break;
+    }
+    unsigned char end = 0xFF;  // so that ("ab", "c") and ("a", "bc") differ
+    mix(&end, 1);
+  }
+  return static_cast<long long>(hash);
+}
 
 // ---------------------------------------------------------------------------- Statement
 
@@ -88,6 +135,15 @@ bool Statement::step() {
   if (rc == SQLITE_DONE) return false;
   std::string message = sqlite3_errmsg(db_);
   sqlite3_reset(stmt_);
+  if ((rc & 0xFF) == SQLITE_BUSY) {
+    // A unit that began by reading cannot wait for the write lock (SQLite gives up at
+    // once rather than risk two units waiting on each other), nor write once another
+    // process has written since it began: it starts again from a fresh reading.
+    if (!sqlite3_get_autocommit(db_) && sqlite3_txn_state(db_, "main") != SQLITE_TXN_WRITE)
+      throw UniteARecommencer{};
+    throw HostError("le dossier est occupé par un autre utilisateur depuis plus de dix secondes ; "
+                    "rien n'est enregistré, réessayez dans un instant");
+  }
   throw HostError("base de données : " + message);
 }
 
@@ -107,6 +163,12 @@ std::string Statement::text(int column) const {
 long long Statement::integer(int column) const { return sqlite3_column_int64(stmt_, column); }
 double Statement::real(int column) const { return sqlite3_column_double(stmt_, column); }
 bool Statement::isNull(int column) const { return sqlite3_column_type(stmt_, column) == SQLITE_NULL; }
+
+long long Statement::empreinte(int count) const {
+  std::vector<sqlite3_value*> values(static_cast<std::size_t>(count));
+  for (int i = 0; i < count; ++i) values[static_cast<std::size_t>(i)] = sqlite3_column_value(stmt_, i);
+  return empreinteLigne(values.data(), count);
+}
 
 // ---------------------------------------------------------------------------- Database
 
@@ -166,10 +228,14 @@ Statement& Database::prepare(const std::string& sql) {
   return wrappers_.emplace(sql, Statement(db_, stmt)).first->second;
 }
 
-void Database::begin() {
-  if (depth_ == 0) run("BEGIN IMMEDIATE");
+void Database::begin(Verrou verrou) {
+  if (depth_ == 0) run(verrou == Verrou::immediat ? "BEGIN IMMEDIATE" : "BEGIN DEFERRED");
   ++depth_;
 }
+
+bool Database::ecritureEnCours() const { return sqlite3_txn_state(db_, "main") == SQLITE_TXN_WRITE; }
+
+int Database::changements() const { return sqlite3_changes(db_); }
 
 void Database::commit() {
   if (depth_ == 0) return;
@@ -295,8 +361,4 @@ void Database::forgetStatements(const std::string& table) {
   }
 }
 
-}  // namespace host
-
-namespace host {
-long long Database::dernierId() const { return sqlite3_last_insert_rowid(db_); }
 }  // namespace host

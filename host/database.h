@@ -19,6 +19,7 @@
 
 struct sqlite3;
 struct sqlite3_stmt;
+struct sqlite3_value;
 
 namespace host {
 
@@ -27,6 +28,17 @@ struct Colonne {
   Genre genre;
   bool key;  // part of the primary key
 };
+
+// Thrown by a statement of a deferred unit that can no longer take the write lock
+// because another process wrote since the unit began reading. Not a HostError: no
+// handler's trap takes it; it goes up to whoever runs the unit, which rolls it back
+// and plays it again.
+struct UniteARecommencer {};
+
+// Hash of a row's stored values (type and bytes of each), the same whether SQLite or
+// the program computes it: a binding keeps it for the row it read, and writes back
+// only if the row still has it. In SQL: empreinte_ligne(col1, col2, ...).
+long long empreinteLigne(sqlite3_value** values, int count);
 
 class Statement {
  public:
@@ -44,6 +56,8 @@ class Statement {
   long long integer(int column) const;
   double real(int column) const;
   bool isNull(int column) const;
+  // empreinteLigne of the first `count` columns of the current row.
+  long long empreinte(int count) const;
 
  private:
   sqlite3* db_;
@@ -67,10 +81,15 @@ class Database {
   Statement& prepare(const std::string& sql);
 
   // Units of work nest; only the outermost commits or rolls back.
-  void begin();
+  enum class Verrou { immediat, differe };
+  void begin(Verrou verrou = Verrou::immediat);
   void commit();
   void rollback();
   int profondeur() const { return depth_; }
+  // True while the unit holds the dossier's write lock (it wrote to the dossier).
+  bool ecritureEnCours() const;
+  // Rows changed by the last INSERT, UPDATE or DELETE.
+  int changements() const;
 
   // Dictionary of a table (main or session-private); throws for an unknown table.
   const std::vector<Colonne>& colonnes(const std::string& table);
@@ -88,7 +107,6 @@ class Database {
   void libererCopiePrivee(const std::string& name);
   std::optional<std::string> reprendreCopiePrivee(const std::string& model);
 
-  long long dernierId() const;
   sqlite3* brut() { return db_; }
 
  private:

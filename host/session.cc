@@ -3,12 +3,18 @@
 #include <algorithm>
 
 #include "host/automate.h"
+#include "host/currency.h"
 #include "host/error.h"
+#include "host/snapshot.h"
 
 namespace host {
 
 namespace {
 thread_local Session* current = nullptr;
+
+// An action that keeps finding the dossier changed under it by other processes
+// gives up after this many starts, rather than trying for ever.
+constexpr int kMaxBusyStarts = 20;
 
 }  // namespace
 
@@ -21,13 +27,29 @@ bool estTableDeTravail(const std::string& name) {
 
 // ---------------------------------------------------------------------------- Transcript
 
-void Transcript::ajouter(std::string sorte, std::string texte) {
+bool Transcript::ajouter(std::string sorte, std::string texte) {
+  if (replay_at_ < replay_.size()) {
+    const Entree& seen = replay_[replay_at_];
+    if (seen.sorte == sorte && seen.texte == texte) {
+      ++replay_at_;
+      return false;
+    }
+    replay_.clear();
+    replay_at_ = 0;
+  }
   // The oldest half goes at once, so that keeping the bound costs one move per entry.
   if (entries_.size() >= 2 * kGardees) {
     entries_.erase(entries_.begin(), entries_.begin() + static_cast<std::ptrdiff_t>(kGardees));
     forgotten_ += kGardees;
   }
   entries_.push_back({std::move(sorte), std::move(texte)});
+  return true;
+}
+
+std::vector<Entree> Transcript::depuis(std::size_t from) const {
+  std::size_t first = from > forgotten_ ? from - forgotten_ : 0;
+  if (first >= entries_.size()) return {};
+  return {entries_.begin() + static_cast<std::ptrdiff_t>(first), entries_.end()};
 }
 
 std::vector<std::string> Transcript::textes(const std::string& sorte) const {
@@ -79,9 +101,15 @@ std::optional<std::string> ReponsesPreparees::choisir(const std::string& window,
 
 void ReponsesPreparees::piloter(Session& session, Automate& screen) {
   if (modal_.empty()) return;
-  auto steps = std::move(modal_.front());
+  Steps steps = std::move(modal_.front());
   modal_.pop_front();
+  played_.push_back(steps);
   steps(session, screen);
+}
+
+void ReponsesPreparees::actionRecommencee() {
+  for (auto it = played_.rbegin(); it != played_.rend(); ++it) modal_.push_front(std::move(*it));
+  played_.clear();
 }
 
 // ---------------------------------------------------------------------------- Session
@@ -122,6 +150,39 @@ void Session::tableDeTravail(const std::string& name) {
 
 // ---------------------------------------------------------------------------- actions
 
+// What an action found, for putting it back when it fails or starts again.
+struct Session::Attempt {
+  Snapshot state;
+  std::vector<Automate*> screens;
+  std::set<std::string> libraries;
+  std::size_t transcript_at = 0;
+};
+
+void Session::keep(Attempt& attempt) {
+  for (const auto& screen : screens_) {
+    attempt.screens.push_back(screen.get());
+    screen->keepState(attempt.state);
+  }
+  for (const auto& [name, library] : libraries_) {
+    attempt.libraries.insert(name);
+    library->keepState(attempt.state);
+  }
+  if (devises_) devises_->keepState(attempt.state);
+  attempt.transcript_at = transcript_.oubliees() + transcript_.entrees().size();
+}
+
+void Session::undo(Attempt& attempt, bool silent) {
+  queue_.clear();
+  attempt.state.restore();
+  // Screens and libraries made during the action were made from what it undid.
+  for (std::size_t i = screens_.size(); i-- > 0;) {
+    Automate* screen = screens_[i].get();
+    if (std::find(attempt.screens.begin(), attempt.screens.end(), screen) == attempt.screens.end())
+      close(screen, silent);
+  }
+  std::erase_if(libraries_, [&](const auto& entry) { return !attempt.libraries.count(entry.first); });
+}
+
 bool Session::action(const std::function<void()>& act) {
   if (action_depth_ > 0) {
     // An action played inside another (a modal screen's) belongs to its unit: its
@@ -133,27 +194,63 @@ bool Session::action(const std::function<void()>& act) {
     failed_ = failed_ || failed_before;
     return ok;
   }
-  ++action_depth_;
-  failed_ = false;
-  db_->begin();
-  try {
-    act();
-    executerFile();
-  } catch (const std::exception& e) {
-    signalerErreur("", e.what());
-  }
-  --action_depth_;
-  if (failed_) {
-    queue_.clear();
-    db_->rollback();
-  } else {
+  journal_.clear();
+  agent_->actionCommencee();
+  Database::Verrou lock = Database::Verrou::differe;
+  for (int busy_starts = 0;;) {
+    Attempt attempt;
+    keep(attempt);
+    journal_at_ = 0;
+    pending_ = nullptr;
+    failed_ = false;
+    bool again = false;
+    ++action_depth_;
     try {
-      db_->commit();
+      db_->begin(lock);
+      act();
+      executerFile();
+      // Work a library began in the action and left unfinished ends with it.
+      if (!failed_)
+        for (auto& [name, library] : libraries_) library->endOfUnit();
+    } catch (const UniteARecommencer&) {
+      again = true;
     } catch (const std::exception& e) {
       signalerErreur("", e.what());
-      db_->rollback();
     }
+    --action_depth_;
+    if (!again && !failed_) {
+      try {
+        db_->commit();
+        break;
+      } catch (const std::exception& e) {
+        signalerErreur("", e.what());
+      }
+    }
+    db_->rollback();
+    undo(attempt, again);
+    if (!again) break;
+    if (pending_) {
+      // The question that came once the action had written is asked now that the
+      // dossier is free; the action then starts again with its answer.
+      try {
+        auto asking = std::move(pending_);
+        asking();
+      } catch (const std::exception& e) {
+        signalerErreur("", e.what());
+        break;
+      }
+    } else if (++busy_starts == kMaxBusyStarts) {
+      signalerErreur("", "d'autres utilisateurs modifient le dossier sans relâche : l'action n'a pu aboutir, rien "
+                         "n'est enregistré ; réessayez dans un instant");
+      break;
+    } else {
+      // Another process wrote: this time the action waits for the write lock first.
+      lock = Database::Verrou::immediat;
+    }
+    transcript_.rejouer(transcript_.depuis(attempt.transcript_at));
+    agent_->actionRecommencee();
   }
+  transcript_.rejouer({});
   fermerTermines();
   return !failed_;
 }
@@ -167,8 +264,7 @@ void Session::dansUnite(const std::function<void()>& act) {
 
 void Session::signalerErreur(const std::string& event, const std::string& message) {
   failed_ = true;
-  transcript_.ajouter("erreur", event.empty() ? message : event + " : " + message);
-  agent_->message(message);
+  if (transcript_.ajouter("erreur", event.empty() ? message : event + " : " + message)) agent_->message(message);
 }
 
 // ---------------------------------------------------------------------------- screens and modules
@@ -191,11 +287,11 @@ void Session::executer(AutomatePtr automate) {
   close(raw);
 }
 
-void Session::close(Automate* automate) {
+void Session::close(Automate* automate, bool silent) {
   auto it = std::find_if(screens_.begin(), screens_.end(), [&](const AutomatePtr& p) { return p.get() == automate; });
   if (it == screens_.end()) return;
   forgetQueued(automate);
-  transcript_.ajouter("ferme", automate->code());
+  if (!silent) transcript_.ajouter("ferme", automate->code());
   AutomatePtr owned = std::move(*it);
   screens_.erase(it);
 }
@@ -259,34 +355,72 @@ void Session::forgetQueued(Automate* automate) {
 // ---------------------------------------------------------------------------- user port
 
 void Session::montrer(const std::string& text) {
-  transcript_.ajouter("message", text);
-  agent_->message(text);
+  if (transcript_.ajouter("message", text)) agent_->message(text);
+}
+
+std::optional<std::string> Session::answered(const std::string& kind, const std::string& text) {
+  if (journal_at_ >= journal_.size()) return std::nullopt;
+  const Answered& known = journal_[journal_at_];
+  if (known.kind != kind || known.text != text) {
+    // The action took another road this time: the answers that follow were to
+    // questions of the road it left.
+    journal_.resize(journal_at_);
+    return std::nullopt;
+  }
+  ++journal_at_;
+  return known.answer;
+}
+
+std::string Session::ask(const std::string& kind, const std::string& text, std::function<std::string()> ask) {
+  if (std::optional<std::string> known = answered(kind, text)) {
+    transcript_.ajouter(kind, text);
+    transcript_.ajouter("réponse", *known);
+    return *known;
+  }
+  auto put = [this, kind, text, ask = std::move(ask)] {
+    transcript_.ajouter(kind, text);
+    std::string answer = ask();
+    transcript_.ajouter("réponse", answer);
+    journal_.push_back({kind, text, answer});
+    journal_at_ = journal_.size();
+    return answer;
+  };
+  if (action_depth_ > 0 && db_->ecritureEnCours()) {
+    // Nobody waits for a person while this unit holds the dossier.
+    pending_ = [put] { put(); };
+    throw UniteARecommencer{};
+  }
+  return put();
 }
 
 bool Session::demander(const std::string& question) {
-  transcript_.ajouter("question", question);
-  bool yes = agent_->oui(question);
-  transcript_.ajouter("réponse", yes ? "oui" : "non");
-  return yes;
+  return ask("question", question, [this, question] { return std::string(agent_->oui(question) ? "oui" : "non"); }) ==
+         "oui";
 }
 
 std::string Session::dialoguer(const std::string& title, const std::string& text,
                                const std::vector<std::string>& choices) {
   std::string shown = title + " : " + text;
   for (const auto& c : choices) shown += " | " + c;
-  transcript_.ajouter("dialogue", shown);
-  std::string code = agent_->dialogue(title, text, choices);
-  bool known = std::any_of(choices.begin(), choices.end(), [&](const std::string& c) { return c.rfind(code, 0) == 0; });
-  if (code.empty() || !known) throw HostError("réponse « " + code + " » hors des choix du dialogue « " + text + " »");
-  transcript_.ajouter("réponse", code);
-  return code;
+  return ask("dialogue", shown, [this, title, text, choices] {
+    std::string code = agent_->dialogue(title, text, choices);
+    bool known =
+        std::any_of(choices.begin(), choices.end(), [&](const std::string& c) { return c.rfind(code, 0) == 0; });
+    if (code.empty() || !known) throw HostError("réponse « " + code + " » hors des choix du dialogue « " + text + " »");
+    return code;
+  });
 }
 
 std::optional<std::string> Session::choisir(const std::string& window, const std::vector<std::string>& rows) {
-  transcript_.ajouter("choix", window);
-  auto pick = agent_->choisir(window, rows);
-  transcript_.ajouter("réponse", pick ? *pick : "(abandon)");
-  return pick;
+  // A cancelled choice is kept as the text the transcript shows for it; no row of a
+  // choice window (accounts, codes, currencies) has that key.
+  static const std::string kCancelled = "(abandon)";
+  std::string answer = ask("choix", window, [this, window, rows] {
+    std::optional<std::string> pick = agent_->choisir(window, rows);
+    return pick ? *pick : kCancelled;
+  });
+  if (answer == kCancelled) return std::nullopt;
+  return answer;
 }
 
 void Session::oublierMessages(Automate*) {

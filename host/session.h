@@ -6,8 +6,17 @@
 //
 // One user action is one unit (action()): it begins a unit of work, runs the
 // handler, then the queued procedures in order, and commits. When a handler
-// raised a host error, or anything else escaped, the unit is rolled back whole:
-// a killed process or a failed action never leaves half its writes behind.
+// raised a host error, or anything else escaped, the unit is rolled back whole and
+// the session is put back as the action found it (every automaton's variables,
+// buffers, lists and screen state, the currency service): a killed process or a
+// failed action never leaves half its writes behind, in the dossier or on screen.
+//
+// A unit takes no lock while it only reads, and never holds the dossier's write
+// lock while a person thinks: a question that comes once the action has written is
+// asked after the unit is rolled back, and the action is then played again from its
+// start, the answers already given taken from the session's journal instead of being
+// asked twice. The same happens when another process wrote the dossier after the
+// action began reading. What the user already saw is not shown twice.
 #pragma once
 
 #include <deque>
@@ -47,7 +56,9 @@ class Transcript {
  public:
   static constexpr std::size_t kGardees = 10000;
 
-  void ajouter(std::string sorte, std::string texte);
+  // Adds an entry; false when it repeats what an action played again already
+  // showed (see rejouer), which is then not added.
+  bool ajouter(std::string sorte, std::string texte);
   // The entries kept, oldest first; the first one is number oubliees().
   const std::vector<Entree>& entrees() const { return entries_; }
   // How many entries went before the ones kept (dropped, or emptied by vider()).
@@ -59,10 +70,20 @@ class Transcript {
     forgotten_ += entries_.size();
     entries_.clear();
   }
+  // The entries from number `from` on (as far as they are kept).
+  std::vector<Entree> depuis(std::size_t from) const;
+  // An action is played again: the entries it adds are dropped as long as they are
+  // the ones `seen` already holds, in order; the first that differs ends that.
+  void rejouer(std::vector<Entree> seen) {
+    replay_ = std::move(seen);
+    replay_at_ = 0;
+  }
 
  private:
   std::vector<Entree> entries_;
   std::size_t forgotten_ = 0;
+  std::vector<Entree> replay_;
+  std::size_t replay_at_ = 0;
 };
 
 // The user. Screens never block on a terminal: every question comes here.
@@ -79,6 +100,10 @@ class UserAgent {
   virtual std::optional<std::string> choisir(const std::string& window, const std::vector<std::string>& rows) = 0;
   // Acts on a modal screen until it is closed (or there is nothing more to do).
   virtual void piloter(Session& session, Automate& screen) = 0;
+  // A user action begins; it is played again from its start (what the user did on
+  // modal screens since it began will be asked for again).
+  virtual void actionCommencee() {}
+  virtual void actionRecommencee() {}
 };
 
 // Answers given in advance, in order. A question with no answer left is an
@@ -96,12 +121,16 @@ class ReponsesPreparees : public UserAgent {
                        const std::vector<std::string>& choices) override;
   std::optional<std::string> choisir(const std::string& window, const std::vector<std::string>& rows) override;
   void piloter(Session& session, Automate& screen) override;
+  void actionCommencee() override { played_.clear(); }
+  void actionRecommencee() override;
 
  private:
+  using Steps = std::function<void(Session&, Automate&)>;
   std::deque<bool> yes_no_;
   std::deque<std::string> dialogs_;
   std::deque<std::optional<std::string>> picks_;
-  std::deque<std::function<void(Session&, Automate&)>> modal_;
+  std::deque<Steps> modal_;
+  std::vector<Steps> played_;  // modal steps played since the action began
 };
 
 class Session {
@@ -171,8 +200,21 @@ class Session {
     Automate* automate;
     std::string procedure;
   };
+  // A question answered during the action under way, kept for when it is played again.
+  struct Answered {
+    std::string kind, text, answer;
+  };
+  struct Attempt;
   void forgetQueued(Automate* automate);
-  void close(Automate* automate);
+  void close(Automate* automate, bool silent = false);
+  void keep(Attempt& attempt);
+  void undo(Attempt& attempt, bool silent);
+  // The answer of the journal for this question, when the action played again has
+  // come to it.
+  std::optional<std::string> answered(const std::string& kind, const std::string& text);
+  // Asks through `ask`, unless the unit holds the write lock: the question is then
+  // kept for once the unit is rolled back, and the action starts again.
+  std::string ask(const std::string& kind, const std::string& text, std::function<std::string()> ask);
 
   std::unique_ptr<Database> db_;
   UserAgent* agent_;
@@ -184,6 +226,9 @@ class Session {
   std::set<std::string> work_tables_;
   int action_depth_ = 0;
   bool failed_ = false;
+  std::vector<Answered> journal_;
+  std::size_t journal_at_ = 0;
+  std::function<void()> pending_;  // a question to ask once the unit is rolled back
   Session* previous_;
   std::shared_ptr<Devises> devises_;
 };

@@ -5,6 +5,7 @@
 #include "host/automate.h"
 #include "host/error.h"
 #include "host/session.h"
+#include "host/snapshot.h"
 
 namespace host {
 
@@ -79,6 +80,7 @@ void Table::open() {
     physical_ = name_;
     if (estTableDeTravail(name_)) session.tableDeTravail(name_);
   }
+  checked_ = !private_copy_ && !estTableDeTravail(name_);
   columns_ = &db_->colonnes(physical_);
   buffer_.clear();
   for (const auto& c : *columns_) buffer_.push_back(Valeur::vide(c.genre));
@@ -232,6 +234,7 @@ void Table::load(Statement& s) {
       buffer_[i] = Valeur::depuisTexte(genre, s.text(c), alias() + "." + (*columns_)[i].name);
   }
   rowid_ = s.integer(static_cast<int>(columns_->size()));
+  if (checked_) as_read_ = s.empreinte(static_cast<int>(columns_->size()));
 }
 
 int Table::lit(int, Champ& field, char op, const Valeur& value) {
@@ -311,6 +314,21 @@ void Table::raz(char) {
   rowid_.reset();
 }
 
+std::string Table::columnHash() const {
+  std::string sql = "empreinte_ligne(";
+  for (std::size_t i = 0; i < columns_->size(); ++i) sql += (i ? ", " : "") + quoteIdent((*columns_)[i].name);
+  return sql + ")";
+}
+
+void Table::changedMeanwhile() {
+  std::string key;
+  for (std::size_t i = 0; i < columns_->size(); ++i)
+    if ((*columns_)[i].key) key += (key.empty() ? "" : " ") + buffer_[i].chaine();
+  throw HostError("La fiche « " + key + " » de « " + name_ +
+                  " » a été modifiée ou supprimée par un autre utilisateur depuis que vous l'avez lue : "
+                  "rien n'est enregistré.@Fermez-la puis rouvrez-la pour voir son état actuel.");
+}
+
 void Table::ecrit() {
   open();
   std::string sql;
@@ -319,6 +337,7 @@ void Table::ecrit() {
     for (std::size_t i = 0; i < columns_->size(); ++i)
       sql += (i ? ", " : "") + quoteIdent((*columns_)[i].name) + " = ?";
     sql += " WHERE rowid = ?";
+    if (checked_) sql += " AND " + columnHash() + " = ?";
   } else {
     std::string names, marks;
     for (std::size_t i = 0; i < columns_->size(); ++i) {
@@ -327,25 +346,38 @@ void Table::ecrit() {
     }
     sql = "INSERT INTO " + sqlName() + " (" + names + ") VALUES (" + marks + ")";
   }
+  sql += " RETURNING rowid";
+  if (checked_) sql += ", " + columnHash();
   Statement& s = db_->prepare(sql);
-  for (std::size_t i = 0; i < columns_->size(); ++i) s.bind(static_cast<int>(i) + 1, buffer_[i]);
-  if (rowid_) s.bind(static_cast<int>(columns_->size()) + 1, *rowid_);
+  int next = 1;
+  for (std::size_t i = 0; i < columns_->size(); ++i) s.bind(next++, buffer_[i]);
+  if (rowid_) {
+    s.bind(next++, *rowid_);
+    if (checked_) s.bind(next++, as_read_);
+  }
+  bool written;
   try {
-    s.step();
+    written = s.step();
   } catch (const HostError& e) {
     throw HostError("écriture dans « " + alias() + " » refusée : " + e.what());
   }
+  if (!written) changedMeanwhile();
+  rowid_ = s.integer(0);
+  if (checked_) as_read_ = s.integer(1);
   s.reset();
-  if (!rowid_) rowid_ = db_->dernierId();
 }
 
 void Table::supprime() {
   open();
   if (!rowid_) throw HostError("aucun enregistrement courant à supprimer dans « " + alias() + " »");
-  Statement& s = db_->prepare("DELETE FROM " + sqlName() + " WHERE rowid = ?");
+  std::string sql = "DELETE FROM " + sqlName() + " WHERE rowid = ?";
+  if (checked_) sql += " AND " + columnHash() + " = ?";
+  Statement& s = db_->prepare(sql);
   s.bind(1, *rowid_);
+  if (checked_) s.bind(2, as_read_);
   s.step();
   s.reset();
+  if (db_->changements() == 0) changedMeanwhile();
 }
 
 void Table::vide() {
@@ -356,6 +388,25 @@ void Table::vide() {
   s.step();
   s.reset();
   rowid_.reset();
+}
+
+void Table::keepState(Snapshot& snapshot) {
+  snapshot.keep(filters_);
+  snapshot.keep(active_);
+  snapshot.keep(request_text_);
+  if (db_) {
+    snapshot.keep(buffer_);
+    snapshot.keep(rowid_);
+    snapshot.keep(as_read_);
+    snapshot.keep(order_);
+    return;
+  }
+  // Opened during the action: what it read then belongs to the undone action.
+  snapshot.add([this] {
+    if (!db_) return;
+    for (std::size_t i = 0; i < columns_->size(); ++i) buffer_[i] = Valeur::vide((*columns_)[i].genre);
+    rowid_.reset();
+  });
 }
 
 void Table::copier(Table& from) {

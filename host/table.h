@@ -7,6 +7,10 @@
 //     blanks it; lit() and suivant() fill it from the database; ecrit() writes it
 //     back: an insert when the buffer was blanked, an update of the row it was read
 //     from otherwise. supprime() deletes that row.
+//   - A row of the dossier is written back or deleted only if it is still as the
+//     binding last read or wrote it: another user may have changed or deleted it
+//     since (even in an earlier action of this one). Otherwise ecrit() and supprime()
+//     throw HostError saying so, and nothing is written.
 //   - The request (initRequete, ajouteFiltre, choisitIndex) is only text until
 //     activeRequete(); suivant(3) then reads its first row in index order and
 //     suivant(1) the row after the current one. The position is kept as the index
@@ -36,6 +40,7 @@ namespace host {
 
 class Automate;
 class Champ;
+class Snapshot;
 
 class Table {
  public:
@@ -94,6 +99,9 @@ class Table {
 
   Automate* owner() const { return owner_; }
 
+  // Keeps the buffer, the position and the request for a failed action to put back.
+  void keepState(Snapshot& snapshot);
+
  private:
   friend class Champ;
   struct Filtre {
@@ -111,14 +119,18 @@ class Table {
   std::string orderBy() const;
   void load(Statement& s);
   std::string sqlName() const;
+  std::string columnHash() const;  // empreinte_ligne over every column, as SQL
+  [[noreturn]] void changedMeanwhile();
 
   Automate* owner_;
   std::string name_, alias_, physical_;
   Database* db_ = nullptr;
   bool private_copy_ = false;
+  bool checked_ = false;  // a dossier table: rows are written back only if unchanged
   const std::vector<Colonne>* columns_ = nullptr;
   std::vector<Valeur> buffer_;
   std::optional<long long> rowid_;
+  long long as_read_ = 0;  // empreinteLigne of the row as last read or written (dossier rows)
   std::vector<Filtre> filters_;
   std::vector<std::string> order_;
   bool active_ = false;

@@ -6,6 +6,7 @@
 #include "host/automate.h"
 #include "host/clock.h"
 #include "host/error.h"
+#include "host/snapshot.h"
 #include "host/text.h"
 
 namespace host {
@@ -358,6 +359,11 @@ Decimal Monnaie::valeurArrondie(const Decimal& value, int decimals, std::string_
     return value.sign() < 0 ? cut - step : cut + step;
   }
   throw HostError("mode d'arrondi inconnu « " + std::string(mode) + " »");
+}
+
+void Donnee::keepState(Snapshot& snapshot) {
+  snapshot.keep(own_);
+  snapshot.keep(bound_);
 }
 
 }  // namespace host

@@ -22,6 +22,7 @@
 namespace host {
 
 class Automate;
+class Snapshot;
 
 enum class Genre { Texte, Entier, Double, Simple, Date, Monnaie };
 const char* nomGenre(Genre genre);
@@ -126,6 +127,9 @@ class Donnee {
   std::size_t longueur() const;
 
   // Reads and writes go to `target` from now on (reference parameter).
+  // Keeps the value and the binding for a failed action to put back.
+  void keepState(Snapshot& snapshot);
+
   void lier(Donnee& target);
   void delier() { bound_ = nullptr; }
   bool estLiee() const { return bound_ != nullptr; }

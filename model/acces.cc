@@ -2,6 +2,7 @@
 
 #include "host/error.h"
 #include "host/session.h"
+#include "host/snapshot.h"
 #include "host/table.h"
 #include "model/step.h"
 
@@ -50,7 +51,8 @@ void Scritere::refreshList() {
 void Scritere::fill() {
   host::Table& main = *table(false);
   out_of_date_ = false;
-  shown_.clear();
+  // A new list: the one it replaces may still be kept for a failed action to put back.
+  shown_ = std::make_shared<std::vector<Shown>>();
   selected_ = 0;
   alias_ = main.alias();
   columns_ = main.colonnes();
@@ -83,21 +85,32 @@ void Scritere::fill() {
       row.values += '\0';
     }
     row.values.shrink_to_fit();
-    shown_.push_back(std::move(row));
+    shown_->push_back(std::move(row));
   }
-  shown_.shrink_to_fit();
-  if (step(*this, list + (shown_.empty() ? "_LISTE_VIDE" : "_LISTE_PLEINE")) == Outcome::stopped) return;
-  if (!shown_.empty()) selectRow(1);
+  shown_->shrink_to_fit();
+  if (step(*this, list + (shown_->empty() ? "_LISTE_VIDE" : "_LISTE_PLEINE")) == Outcome::stopped) return;
+  if (!shown_->empty()) selectRow(1);
+}
+
+void Scritere::keepState(host::Snapshot& snapshot) {
+  Traitecr::keepState(snapshot);
+  snapshot.keep(out_of_date_);
+  snapshot.keep(alias_);
+  snapshot.keep(columns_);
+  snapshot.keep(variables_);
+  snapshot.keep(keyColumn_);
+  snapshot.keep(shown_);
+  snapshot.keep(selected_);
 }
 
 void Scritere::checkRow(int n) const {
-  if (n < 1 || n > static_cast<int>(shown_.size()))
+  if (n < 1 || n > static_cast<int>(shown_->size()))
     throw host::HostError("la liste « " + std::string(kList) + " » n'a pas de ligne " + std::to_string(n));
 }
 
 RowText Scritere::row(int n) const {
   checkRow(n);
-  const std::string& packed = shown_[n - 1].values;
+  const std::string& packed = (*shown_)[n - 1].values;
   RowText text;
   std::size_t at = 0;
   auto next = [&] {
@@ -118,8 +131,8 @@ RowText Scritere::row(int n) const {
 
 std::vector<RowText> Scritere::rows() const {
   std::vector<RowText> out;
-  out.reserve(shown_.size());
-  for (std::size_t n = 1; n <= shown_.size(); ++n) out.push_back(row(static_cast<int>(n)));
+  out.reserve(shown_->size());
+  for (std::size_t n = 1; n <= shown_->size(); ++n) out.push_back(row(static_cast<int>(n)));
   return out;
 }
 
@@ -128,7 +141,7 @@ void Scritere::selectRow(int n) {
   host::Table& main = *table(false);
   if (keyColumn_ >= 0) {
     host::Champ key(columns_[keyColumn_].name.c_str(), &main);
-    if (main.lit(3, key, '=', shown_[n - 1].key) != 0)
+    if (main.lit(3, key, '=', (*shown_)[n - 1].key) != 0)
       throw host::HostError("la ligne " + std::to_string(n) + " de la liste n'existe plus dans « " + main.alias() + " »");
   } else {
     // Without a one-field key the row cannot be read again: its values are put back.

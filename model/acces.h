@@ -21,6 +21,7 @@
 #pragma once
 
 #include <map>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -46,7 +47,7 @@ class Scritere : public Traitecr {
 
   // Rows shown, in list order; row(n) from 1. The text is made when asked for: a
   // list keeps each row's values packed, so that a long list stays small.
-  std::size_t rowCount() const { return shown_.size(); }
+  std::size_t rowCount() const { return shown_->size(); }
   RowText row(int n) const;
   std::vector<RowText> rows() const;
   // Selects row n (from 1): the main table's buffer is read again on that row.
@@ -57,6 +58,7 @@ class Scritere : public Traitecr {
 
   void demarrer() override;
   void reactiver() override;
+  void keepState(host::Snapshot& snapshot) override;
 
  protected:
   // Steps of the start before "ACTIVE_REQUETE" ("INIT", "AVANT_DEBUT", "DEBUT").
@@ -78,7 +80,7 @@ class Scritere : public Traitecr {
   std::vector<host::Colonne> columns_;   // of the main table, at the last fill
   std::vector<std::string> variables_;   // names of the screen's variables, at the last fill
   int keyColumn_ = -1;                   // the one-field key among columns_, or -1
-  std::vector<Shown> shown_;
+  std::shared_ptr<std::vector<Shown>> shown_ = std::make_shared<std::vector<Shown>>();
   int selected_ = 0;
 };
 

@@ -2,6 +2,7 @@
 
 #include "host/error.h"
 #include "host/session.h"
+#include "host/snapshot.h"
 #include "host/table.h"
 #include "model/numbering.h"
 #include "model/step.h"
@@ -94,6 +95,13 @@ void Saisie::makeNew(Table& t) {
   for (const Colonne& c : t.colonnes()) values.emplace_back(c.name, t.valeur(c.name));
   t.raz();
   for (const auto& [name, value] : values) t.affecter(name, value);
+}
+
+void Saisie::keepState(host::Snapshot& snapshot) {
+  AutomTab::keepState(snapshot);
+  snapshot.keep(saved_);
+  snapshot.keep(deletion_allowed_);
+  snapshot.keep(mode_);
 }
 
 void Saisie::applyVisuRequest() {

@@ -125,6 +125,8 @@ class Saisie : public AutomTab {
   // step or action.
   void applyVisuRequest();
 
+  void keepState(host::Snapshot& snapshot) override;
+
  protected:
   // Switches to mode `m` and, when `announce`, runs its start event.
   void enterMode(char m, bool announce = true);

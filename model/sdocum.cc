@@ -5,6 +5,7 @@
 
 #include "host/error.h"
 #include "host/session.h"
+#include "host/snapshot.h"
 #include "model/step.h"
 
 namespace model {
@@ -158,6 +159,16 @@ void Sdocum::clearLines() {
   img.vide();
   img.activeRequete();
   line_->raz();
+}
+
+void Sdocum::keepState(host::Snapshot& snapshot) {
+  Setape::keepState(snapshot);
+  snapshot.keep(current_);
+  snapshot.keep(in_entry_);
+  snapshot.keep(in_list_);
+  snapshot.keep(line_stored_);
+  snapshot.keep(shown_variables_);
+  snapshot.keep(refused_control_);
 }
 
 void Sdocum::deleteLines(const std::string& ident) {

@@ -127,6 +127,8 @@ class Sdocum : public Setape {
   // The focus is back in the header: the list will be entered again.
   void leaveList() { in_list_ = false; }
 
+  void keepState(host::Snapshot& snapshot) override;
+
   // Lines of the image, in order, as shown: "MIRVAL.NUMCP" and "NUMCP" for the
   // fields, and the variables as "SELECTION" last left them for that line.
   std::vector<RowText> rows();

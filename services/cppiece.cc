@@ -13,6 +13,7 @@
 #include "host/error.h"
 #include "host/registry.h"
 #include "host/session.h"
+#include "host/snapshot.h"
 #include "host/value.h"
 #include "services/sql.h"
 
@@ -187,6 +188,18 @@ class PieceImport : public host::Automate {
   void fin_import(Evt* e);
   void posdebut_erreur(Evt* e);
   void erreur_suivante(Evt* e);
+
+  void keepState(host::Snapshot& snapshot) override {
+    Automate::keepState(snapshot);
+    snapshot.keep(instance_);
+    snapshot.keep(errorCursor_);
+  }
+  // An instance that the user action leaves open (its caller stopped at a failure, or
+  // its piece was refused) is given up with the action: its transfer rows go, and
+  // nothing of it is left open in the dossier.
+  void endOfUnit() override {
+    if (instance_) closeInstance("A");
+  }
 
  private:
   struct Instance {
