@@ -3,6 +3,7 @@
 #include <sqlite3.h>
 
 #include <cstdint>
+#include <cstdlib>
 #include <filesystem>
 
 #include "host/error.h"
@@ -40,6 +41,17 @@ Genre genreOf(const std::string& declared) {
   if (first == "RATE" || first == "REAL") return Genre::Double;
   if (first == "INTEGER") return Genre::Entier;
   return Genre::Texte;
+}
+
+// What a statement that found the dossier busy means (nothing when it did not).
+void failIfBusy(sqlite3* db, int rc) {
+  if ((rc & 0xFF) != SQLITE_BUSY) return;
+  // A unit that began by reading cannot wait for the write lock (SQLite gives up at
+  // once rather than risk two units waiting on each other), nor write once another
+  // process has written since it began: it starts again from a fresh reading.
+  if (!sqlite3_get_autocommit(db) && sqlite3_txn_state(db, "main") != SQLITE_TXN_WRITE) throw UniteARecommencer{};
+  throw HostError("le dossier est occupé par un autre utilisateur depuis plus de dix secondes ; "
+                  "rien n'est enregistré, réessayez dans un instant");
 }
 
 void rowHashFunction(sqlite3_context* context, int count, sqlite3_value** values) {
@@ -129,21 +141,30 @@ Statement& Statement::bind(int index, const Valeur& v) {
   }
 }
 
+namespace {
+
+// Fault trials: with MIRVAE_FAULT_KILL_AT_WRITE=N in its environment, the process
+// dies at once, as under kill -9, before its N-th statement that writes a row, so
+// that tests can stop it between any two writes.
+void dieBeforeWriteIfAsked(sqlite3_stmt* stmt) {
+  static const long long at = [] {
+    const char* text = std::getenv("MIRVAE_FAULT_KILL_AT_WRITE");
+    return text ? std::atoll(text) : 0LL;
+  }();
+  static long long writes = 0;
+  if (at > 0 && !sqlite3_stmt_readonly(stmt) && ++writes == at) std::_Exit(137);
+}
+
+}  // namespace
+
 bool Statement::step() {
+  dieBeforeWriteIfAsked(stmt_);
   int rc = sqlite3_step(stmt_);
   if (rc == SQLITE_ROW) return true;
   if (rc == SQLITE_DONE) return false;
   std::string message = sqlite3_errmsg(db_);
   sqlite3_reset(stmt_);
-  if ((rc & 0xFF) == SQLITE_BUSY) {
-    // A unit that began by reading cannot wait for the write lock (SQLite gives up at
-    // once rather than risk two units waiting on each other), nor write once another
-    // process has written since it began: it starts again from a fresh reading.
-    if (!sqlite3_get_autocommit(db_) && sqlite3_txn_state(db_, "main") != SQLITE_TXN_WRITE)
-      throw UniteARecommencer{};
-    throw HostError("le dossier est occupé par un autre utilisateur depuis plus de dix secondes ; "
-                    "rien n'est enregistré, réessayez dans un instant");
-  }
+  failIfBusy(db_, rc);
   throw HostError("base de données : " + message);
 }
 
@@ -207,9 +228,10 @@ Database::~Database() {
 void Database::exec(std::string_view sql) {
   char* error = nullptr;
   std::string text(sql);
-  if (sqlite3_exec(db_, text.c_str(), nullptr, nullptr, &error) != SQLITE_OK) {
+  if (int rc = sqlite3_exec(db_, text.c_str(), nullptr, nullptr, &error); rc != SQLITE_OK) {
     std::string message = error ? error : "erreur";
     sqlite3_free(error);
+    failIfBusy(db_, rc);
     throw HostError("base de données : " + message);
   }
 }

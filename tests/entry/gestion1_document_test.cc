@@ -2,12 +2,16 @@
 // validation dialog and the posting after saving, the guards on modification and
 // deletion, and the record information.
 #include <algorithm>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
 
 #include <gtest/gtest.h>
 
 #include "host/registry.h"
 #include "model/impetat.h"
 #include "model/impression.h"
+#include "services/cppiece.h"
 #include "tests/entry/gestion1_fixture.h"
 
 namespace {
@@ -310,3 +314,105 @@ TEST_F(ReplacementTest, ASaveWhoseNewPieceTheLedgerRefusesKeepsTheOldPiece) {
   EXPECT_EQ(mode(), "M");
   EXPECT_EQ(valeur("V_TOT_TTC"), "1794.00");
 }
+
+// Whatever undid the save, the screen keeps nothing the undone action wrote: saving
+// again replaces the old piece, and the invoice is in the books once.
+TEST_F(ReplacementTest, ASaveUndoneThenMadeAgainPostsTheInvoiceOnce) {
+  for (const char* failing : {"FIN_PIECE", "DEBUT_LIGNE"}) {
+    SCOPED_TRACE(failing);
+    facturePosteeEnModification();
+    auto& hooks = services::importTestHooks();
+    hooks = {};
+    hooks.failProcedure = failing;
+    hooks.failOccurrence = 1;
+    hooks.failCode = 10;
+    ASSERT_TRUE(model::allerLigne(session(), 2));
+    ASSERT_TRUE(saisir("LST_V_HT", "120"));
+    ASSERT_TRUE(model::validerLigne(session()));
+    EXPECT_FALSE(appuyer("B_VALID_DOC"));
+    hooks = {};
+    expectUnchanged();
+    EXPECT_EQ(valeur("MIRVAE.NPIES"), npies_);
+    EXPECT_EQ(valeur("MIRVAE.TTC"), "1746.00");
+
+    EXPECT_TRUE(appuyer("B_VALID_DOC"));
+    EXPECT_EQ(nombre("SELECT count(*) FROM PIECE"), 1);
+    EXPECT_EQ(sql("SELECT TTC FROM MIRVAE"), "1794");
+    EXPECT_EQ(sql("SELECT sum(MTDEB) FROM MOUVE"), "1794");
+    EXPECT_EQ(testing_support::incoherences(base()), std::vector<std::string>{});
+    model::fermer(session());
+    sql("DELETE FROM MOUVE");
+    sql("DELETE FROM PIECE");
+    sql("DELETE FROM MIRVAL");
+    sql("DELETE FROM MIRVAE");
+  }
+}
+
+TEST_F(ReplacementTest, ACreationWhosePieceIsRefusedLeavesNoImportBehind) {
+  sql("DELETE FROM COMPT WHERE NUMCP LIKE '4457%'");
+  ASSERT_TRUE(facture());
+  enregistrer("1");
+  EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE"), 1);
+  EXPECT_EQ(nombre("SELECT count(*) FROM PIECE"), 0);
+  EXPECT_EQ(nombre("SELECT count(*) FROM IMPORT_INSTANCE WHERE ETAT = 'O'"), 0);
+  EXPECT_EQ(nombre("SELECT (SELECT count(*) FROM PIECE_IMM) + (SELECT count(*) FROM MOUVE_IMM) + "
+                   "(SELECT count(*) FROM ECHEA_IMM) + (SELECT count(*) FROM VTSEC_IMM)"),
+            0);
+}
+
+// Two users on one invoice: while this one has it open in modification, another
+// process changes or deletes it. This user's save or deletion is then refused in
+// plain words, and the books hold the other user's work, once.
+struct Concurrent {
+  const char* other;  // what the other user does, as a session script
+  const char* mine;   // "save" or "delete"
+  long long pieces;   // pieces in the ledger after both
+  const char* ttc;    // the invoice's total after both, "" when it is gone
+};
+
+class TwoUsersTest : public ReplacementTest, public ::testing::WithParamInterface<Concurrent> {
+ protected:
+  // Plays `actions` as another user, in another process, on the same dossier.
+  int autreUtilisateur(const std::string& actions) {
+    std::string script = testing_support::cheminTemporaire("autre") + ".txt";
+    {
+      std::ofstream out(script);
+      out << "today 15/03/2024 11:00\nopen MIRVAE-ACCES1\nselect 1\n" << actions << "expect no error\n";
+    }
+    std::string command = std::string("'") + MIRVAE_BINARY + "' run '" + path_ + "' '" + script + "' > /dev/null 2>&1";
+    int status = std::system(command.c_str());
+    std::filesystem::remove(script);
+    return status;
+  }
+};
+
+TEST_P(TwoUsersTest, TheSecondUserIsToldAndNothingIsDoubledOrLost) {
+  const Concurrent& c = GetParam();
+  facturePosteeEnModification();
+  ASSERT_EQ(autreUtilisateur(c.other), 0);
+
+  if (std::string(c.mine) == "save") {
+    ASSERT_TRUE(model::allerLigne(session(), 2));
+    ASSERT_TRUE(saisir("LST_V_HT", "90"));
+    ASSERT_TRUE(model::validerLigne(session()));
+    EXPECT_FALSE(appuyer("B_VALID_DOC"));
+  } else {
+    EXPECT_FALSE(appuyer("SUPPRESSION"));
+  }
+
+  auto errors = session().transcript().textes("erreur");
+  ASSERT_FALSE(errors.empty());
+  EXPECT_NE(errors.back().find("modifiée ou supprimée par un autre utilisateur"), std::string::npos) << errors.back();
+  EXPECT_EQ(nombre("SELECT count(*) FROM PIECE"), c.pieces);
+  EXPECT_EQ(sql("SELECT TTC FROM MIRVAE"), c.ttc);
+  EXPECT_EQ(testing_support::incoherences(base()), std::vector<std::string>{});
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    Deux, TwoUsersTest,
+    ::testing::Values(
+        Concurrent{"press MODIFIER\nline 2\ntype LST_V_HT 120\nline validate\npress B_VALID_DOC\n", "save", 1, "1794"},
+        Concurrent{"press MODIFIER\nline 2\ntype LST_V_HT 120\nline validate\npress B_VALID_DOC\n", "delete", 1,
+                   "1794"},
+        Concurrent{"press MODIFIER\npress SUPPRESSION\n", "save", 0, ""},
+        Concurrent{"press MODIFIER\npress SUPPRESSION\n", "delete", 0, ""}));

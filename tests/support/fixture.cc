@@ -14,6 +14,35 @@ std::string cheminTemporaire(const std::string& stem) {
       .string();
 }
 
+std::vector<std::string> incoherences(host::Database& db) {
+  static const std::pair<const char*, const char*> checks[] = {
+      {"opération sans sa pièce",
+       "SELECT IDENT FROM MIRVAE e WHERE NPIES <> '' AND NOT EXISTS (SELECT 1 FROM PIECE p WHERE p.NPIES = e.NPIES)"},
+      {"pièce sans son opération",
+       "SELECT NPIES FROM PIECE p WHERE NOT EXISTS (SELECT 1 FROM MIRVAE e WHERE e.NPIES = p.NPIES)"},
+      {"pièce de deux opérations", "SELECT NPIES FROM MIRVAE WHERE NPIES <> '' GROUP BY NPIES HAVING count(*) > 1"},
+      {"en-tête différent de la somme de ses lignes",
+       "SELECT IDENT FROM MIRVAE e WHERE abs(CAST(HT AS REAL) - (SELECT coalesce(sum(CAST(HT AS REAL)), 0) FROM "
+       "MIRVAL l WHERE l.NUMERO GLOB e.IDENT || '|*')) > 0.0001 OR abs(CAST(TTC AS REAL) - (SELECT "
+       "coalesce(sum(CAST(TTC AS REAL)), 0) FROM MIRVAL l WHERE l.NUMERO GLOB e.IDENT || '|*')) > 0.0001"},
+      {"pièce déséquilibrée",
+       "SELECT NPIES FROM MOUVE GROUP BY NPIES HAVING abs(sum(CAST(MTDEB AS REAL)) - sum(CAST(MTCRE AS REAL))) > "
+       "0.0001"},
+      {"mouvement sans pièce", "SELECT UNIQ FROM MOUVE m WHERE NOT EXISTS (SELECT 1 FROM PIECE p WHERE p.NPIES = m.NPIES)"},
+      {"instance d'import ouverte", "SELECT NINST FROM IMPORT_INSTANCE WHERE ETAT = 'O'"},
+      {"ligne de transfert laissée",
+       "SELECT NINST FROM PIECE_IMM UNION ALL SELECT NINST FROM MOUVE_IMM UNION ALL SELECT NINST FROM ECHEA_IMM "
+       "UNION ALL SELECT NINST FROM VTSEC_IMM"},
+  };
+  std::vector<std::string> found;
+  for (const auto& [what, query] : checks) {
+    host::Statement& s = db.prepare(query);
+    while (s.step()) found.push_back(std::string(what) + " : " + s.text(0));
+    s.reset();
+  }
+  return found;
+}
+
 void DossierTest::SetUp() {
   registry::chargerBibliotheque();
   host::clock::setToday(jourDeTest());

@@ -7,6 +7,7 @@
 #include <filesystem>
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "host/clock.h"
 #include "host/registry.h"
@@ -27,6 +28,12 @@ template <typename T>
 void moduleDeTest(const char* name) {
   if (!host::Registre::instance().module(name)) host::Module("", name, &host::fabriquer<T>, false, "");
 }
+
+// What is wrong with the books of a dossier, one text a fault: an operation whose
+// piece is missing (unless it never was posted), a piece without its operation, a
+// header that is not the sum of its lines, a piece that does not balance, an import
+// instance or transfer row left behind. Empty when the books hold.
+std::vector<std::string> incoherences(host::Database& db);
 
 // A unique file name in the temporary directory.
 std::string cheminTemporaire(const std::string& stem);
