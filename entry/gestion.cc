@@ -66,7 +66,7 @@ bool EntryScreen::lireOuVider(Table& t, Champ& field, const Donnee& value) {
   return false;
 }
 
-void EntryScreen::lireJournal() { lireOuVider(JONAL, JONAL_NUMJL, MIRVAE_NUMJL); }
+bool EntryScreen::lireJournal() { return lireOuVider(JONAL, JONAL_NUMJL, MIRVAE_NUMJL); }
 
 std::string EntryScreen::anneeMois() {
   if (MIRVAE_DTOPE.estVide()) return "";
@@ -271,7 +271,8 @@ void EntryScreen::debut_creation(Evt* e) {
   MIRVAE_NUMJL = JONAL_NUMJL;
 
   MIRVAE_DTOPE = Date::dateCourante();
-  if (MIRVAE_DTOPE > DATE_CLOTURE) MIRVAE_DTOPE = "";
+  // A day the ledger would refuse is not proposed: the user types the date.
+  if (MIRVAE_DTOPE > DATE_CLOTURE || MIRVAE_DTOPE < PARAM_PDDEX) MIRVAE_DTOPE = "";
   if (JONAL_NUMEROPI == "A") MIRVAE_NPIEC = kPlaceholder;
 
   if (kind_.currency == CreationCurrency::Dossier)

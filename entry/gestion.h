@@ -168,7 +168,7 @@ class EntryScreen : public model::Gestion_document2 {
   static bool lireOuVider(Table& t, Champ& field, const Donnee& value);
   // The operation's journal into JONAL (blank when unknown). The screen's journal
   // field is typed freely, so every rule that reads JONAL reads it again first.
-  void lireJournal();
+  bool lireJournal();
   // Year and month of the operation date, "YYYYMM"; "" while the date is empty.
   std::string anneeMois();
   // Replaces "[PIECE]" in the piece label by the piece number.

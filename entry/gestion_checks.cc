@@ -91,7 +91,10 @@ void EntryScreen::grp1_sortie(Evt*) {
 void EntryScreen::controler_p1(Evt* e) {
   erreurMethode(1, e);
   if (MIRVAE_DTOPE.estVide()) return refuser(e, "La saisie d'une date d'opération est obligatoire !", "DTOPE");
-  lireJournal();
+  // The journal may have been typed: only one of the kind's nature takes the operation.
+  if (!lireJournal() || JONAL_TYPJL != kind_.journalNature)
+    return refuser(e, "Le journal <" + MIRVAE_NUMJL.chaine() + "> n'existe pas ou n'est pas de la nature attendue !",
+                   "NUMJL");
   // Year-months compare as text: "YYYYMM".
   if (anneeMois() <= JONAL_CLOAM.chaine())
     return refuser(e, "Le journal <" + JONAL_NUMJL.chaine() + "> est clos pour cette date !", "DTOPE");

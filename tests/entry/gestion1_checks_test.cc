@@ -23,6 +23,10 @@ TEST_F(ControlesTest, HeaderChecksRunInOrderAndOnlyTheFirstFailureIsShown) {
   const std::vector<Faute> fautes = {
       {"La saisie d'une date d'opération est obligatoire !", "DTOPE",
        [&] { ASSERT_TRUE(saisir("MIRVAE.DTOPE", "")); }},
+      {"Le journal <ZZ> n'existe pas ou n'est pas de la nature attendue !", "NUMJL",
+       [&] { ASSERT_TRUE(saisir("MIRVAE.NUMJL", "ZZ")); }},
+      {"Le journal <AC> n'existe pas ou n'est pas de la nature attendue !", "NUMJL",
+       [&] { ASSERT_TRUE(saisir("MIRVAE.NUMJL", "AC")); }},
       {"Le journal <VT> est clos pour cette date !", "DTOPE",
        [&] { sql("UPDATE JONAL SET CLOAM = '202403' WHERE NUMJL = 'VT'"); }},
       {"La saisie d'un numéro de pièce est obligatoire !", "NPIEC",

@@ -49,14 +49,19 @@ TEST_F(DocumentTest, RegisteredInThePostingUnitWithItsBranchTable) {
   EXPECT_EQ(dernierMessage(), "Cette liste n'est pas personnalisable.");
 }
 
-TEST_F(DocumentTest, CreationProposesTodayUnlessItIsPastTheClosingDate) {
+TEST_F(DocumentTest, CreationProposesTodayUnlessItLiesOutsideTheEntryPeriod) {
   const struct {
+    const char* opening;
     const char* closing;
     const char* dtope;
-  } cases[] = {{"2024-03-14", ""}, {"2024-03-15", "15/03/2024"}, {"2024-12-31", "15/03/2024"}};
+  } cases[] = {{"2024-01-01", "2024-03-14", ""},
+               {"2024-01-01", "2024-03-15", "15/03/2024"},
+               {"2024-01-01", "2024-12-31", "15/03/2024"},
+               {"2024-03-15", "2024-12-31", "15/03/2024"},
+               {"2024-03-16", "2024-12-31", ""}};
   for (const auto& c : cases) {
-    SCOPED_TRACE(c.closing);
-    sql(std::string("UPDATE PARAM SET PDTCL = '") + c.closing + "'");
+    SCOPED_TRACE(std::string(c.opening) + " " + c.closing);
+    sql(std::string("UPDATE PARAM SET PDDEX = '") + c.opening + "', PDTCL = '" + c.closing + "'");
     ASSERT_TRUE(creer());
     EXPECT_EQ(valeur("MIRVAE.DTOPE"), c.dtope);
     EXPECT_EQ(valeur("MIRVAE.DTECH"), c.dtope);
