@@ -38,8 +38,9 @@ TEST_F(DevisesTest, ChangingTheCurrencyOfADocumentWithLinesAsksThenConvertsOrKee
   } cases[] = {
       // 15/03/2024: 1.105 dollars, 156.33 yen for one euro.
       {"dollars", "USD", true, "USD 1.105", "110.50 22.10 132.60 / 55.25 0.00 55.25 / 165.75 22.10 187.85"},
-      // No decimals in yen: 3126.6 and 7816.5 round to the nearest, halves away from zero.
-      {"yens", "JPY", true, "JPY 156.33", "15633.00 3127.00 18760.00 / 7817.00 0.00 7817.00 / 23450.00 3127.00 26577.00"},
+      // No decimals in yen: 3126.6 and 7816.5 round to the nearest, halves away from zero,
+      // and the amounts show none.
+      {"yens", "JPY", true, "JPY 156.33", "15633 3127 18760 / 7817 0 7817 / 23450 3127 26577"},
       {"refusé", "USD", false, "EUR 1", "100.00 20.00 120.00 / 50.00 0.00 50.00 / 150.00 20.00 170.00"},
   };
   for (const auto& c : cases) {
