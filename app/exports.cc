@@ -3,6 +3,7 @@
 #include <iomanip>
 #include <sstream>
 
+#include "host/currency.h"
 #include "host/decimal.h"
 
 namespace app {
@@ -19,6 +20,15 @@ std::string keepingCurrency(host::Database& db) {
   std::string currency = s.step() ? s.text(0) : "";
   s.reset();
   return currency.empty() ? "EUR" : currency;
+}
+
+// Decimals of the keeping currency, in which the ledger's amounts are.
+int keepingDecimals(host::Database& db, const std::string& currency) {
+  Statement& s = db.prepare("SELECT DECIMALES FROM MONNAIE WHERE IDENT = ?");
+  s.bind(1, currency);
+  int decimals = s.step() ? static_cast<int>(s.integer(0)) : 2;
+  s.reset();
+  return decimals;
 }
 
 struct Piece {
@@ -39,6 +49,7 @@ std::vector<Piece> pieces(host::Database& db) {
 
 void imprimerGrandLivre(host::Database& db, std::ostream& out) {
   std::string currency = keepingCurrency(db);
+  const int decimals = keepingDecimals(db, currency);
   auto all = pieces(db);
   if (all.empty()) {
     out << "Grand livre vide.\n";
@@ -55,21 +66,24 @@ void imprimerGrandLivre(host::Database& db, std::ostream& out) {
       totalDebit += debit;
       totalCredit += credit;
       out << "    " << std::left << std::setw(16) << m.text(0) << std::setw(10) << m.text(1) << std::setw(36)
-          << m.text(2).substr(0, 34) << std::right << std::setw(14) << (debit.isZero() ? "" : debit.toString())
-          << std::setw(14) << (credit.isZero() ? "" : credit.toString()) << "\n";
+          << m.text(2).substr(0, 34) << std::right << std::setw(14)
+          << (debit.isZero() ? "" : host::amountText(debit, decimals)) << std::setw(14)
+          << (credit.isZero() ? "" : host::amountText(credit, decimals)) << "\n";
     }
     m.reset();
     Statement& e = db.prepare("SELECT DTECH, MTECH FROM ECHEA WHERE NPIES = ? ORDER BY NUSYS");
     e.bind(1, p.npies);
-    while (e.step()) out << "    échéance du " << e.text(0) << " : " << amount(e.text(1)).toString() << "\n";
+    while (e.step())
+      out << "    échéance du " << e.text(0) << " : " << host::amountText(amount(e.text(1)), decimals) << "\n";
     e.reset();
   }
-  out << "Total des mouvements : débit " << totalDebit.toString() << " " << currency << ", crédit "
-      << totalCredit.toString() << " " << currency << "\n";
+  out << "Total des mouvements : débit " << host::amountText(totalDebit, decimals) << " " << currency
+      << ", crédit " << host::amountText(totalCredit, decimals) << " " << currency << "\n";
 }
 
 void exporterHledger(host::Database& db, std::ostream& out) {
   std::string currency = keepingCurrency(db);
+  const int decimals = keepingDecimals(db, currency);
   out << "; ledger of the dossier, amounts in " << currency << "\n\n";
   for (const auto& p : pieces(db)) {
     out << p.dtope << " (" << (p.npiec.empty() ? p.npies : p.npiec) << ") " << p.label << "\n";
@@ -78,7 +92,7 @@ void exporterHledger(host::Database& db, std::ostream& out) {
     m.bind(1, p.npies);
     while (m.step()) {
       Decimal value = amount(m.text(1)) - amount(m.text(2));
-      out << "    " << m.text(0) << "    " << value.toString() << " " << currency << "\n";
+      out << "    " << m.text(0) << "    " << host::amountText(value, decimals) << " " << currency << "\n";
     }
     m.reset();
     out << "\n";

@@ -68,6 +68,21 @@ bool EntryScreen::lireOuVider(Table& t, Champ& field, const Donnee& value) {
 
 bool EntryScreen::lireJournal() { return lireOuVider(JONAL, JONAL_NUMJL, MIRVAE_NUMJL); }
 
+// Opening an operation moved JONAL to its journal: a new operation never inherits it.
+void EntryScreen::readCreationJournal() {
+  switch (kind_.journal) {
+    case CreationJournal::FirstOfNature:
+      if (JONAL.suivant(3) != 0) JONAL.raz();
+      return;
+    case CreationJournal::OfFirstTreasury: {
+      // The header accounts' selection holds the kind's treasury accounts.
+      Champ cptre("CPTRE", &JONAL);
+      if (COMPT1.suivant(3) != 0 || JONAL.lit(3, cptre, '=', COMPT1_NUMCP) != 0) JONAL.raz();
+      return;
+    }
+  }
+}
+
 std::string EntryScreen::anneeMois() {
   if (MIRVAE_DTOPE.estVide()) return "";
   // DD/MM/YYYY: the year, then the month.
@@ -265,9 +280,7 @@ void EntryScreen::debut_modification(Evt* e) {
 void EntryScreen::debut_creation(Evt* e) {
   Saisie::debut_creation(e);
   MIRVAE_TYPE = kind_.type;
-  // JONAL stays on the journal last worked with: the first of the kind's nature at
-  // start, the previous piece's journal when creations follow one another.
-  if (JONAL_NUMJL.estVide() && JONAL.suivant(3) != 0) JONAL.raz();
+  readCreationJournal();
   MIRVAE_NUMJL = JONAL_NUMJL;
 
   MIRVAE_DTOPE = Date::dateCourante();

@@ -169,6 +169,8 @@ class EntryScreen : public model::Gestion_document2 {
   // The operation's journal into JONAL (blank when unknown). The screen's journal
   // field is typed freely, so every rule that reads JONAL reads it again first.
   bool lireJournal();
+  // The journal of a new operation into JONAL, by the kind's rule (blank when none).
+  void readCreationJournal();
   // Year and month of the operation date, "YYYYMM"; "" while the date is empty.
   std::string anneeMois();
   // Replaces "[PIECE]" in the piece label by the piece number.

@@ -14,6 +14,12 @@ enum class CreationCurrency {
   Journal,  // the journal's own currency (treasury and miscellaneous journals)
 };
 
+// Journal given to a new operation.
+enum class CreationJournal {
+  FirstOfNature,    // the first journal of journalNature, by number
+  OfFirstTreasury,  // the journal whose CPTRE is the first account of headerNature
+};
+
 // Due date given to a new operation.
 enum class CreationDueDate {
   OperationDate,  // DTECH := DTOPE
@@ -36,6 +42,7 @@ struct EntryKind {
   const char* vatChoiceType;  // VAT type given to the VAT code choice window
   const char* defaultLabel;   // INPIE of a new operation when the journal has no label prefix
   const char* amountTyped;    // SAISIE_MTT on creation: "1" excluding tax, "2" including tax
+  CreationJournal journal;
   CreationCurrency currency;
   CreationDueDate dueDate;
   const char* postingModule;  // module of library "MIRVAE" run after each save

@@ -11,7 +11,25 @@ namespace {
 
 std::string named(std::string_view ident) { return "« " + std::string(ident) + " »"; }
 
+// A text as a message quotes it: a long one is cut, so that a message stays readable.
+std::string quoted(std::string_view text) {
+  constexpr std::size_t kShown = 24;
+  return "« " + std::string(text.substr(0, kShown)) + (text.size() > kShown ? "…" : "") + " »";
+}
+
 }  // namespace
+
+std::string amountText(const Decimal& amount, int decimals) { return amount.toFixed(decimals); }
+
+Decimal typedAmount(std::string_view text, int decimals, std::string_view what) {
+  Decimal amount = Valeur::depuisTexte(Genre::Monnaie, text, what).decimal();
+  Decimal limit(1);
+  for (int i = 0; i < kAmountMaxIntegerDigits; ++i) limit *= Decimal(10);
+  if (amount.abs() >= limit)
+    throw HostError("Le montant " + quoted(text) + " est trop grand : " + std::to_string(kAmountMaxIntegerDigits) +
+                    " chiffres au plus avant la virgule" + (what.empty() ? "" : " (" + std::string(what) + ")"));
+  return amount.rounded(decimals);
+}
 
 Devises::Devises(Session& session) : session_(session) {}
 
@@ -82,6 +100,14 @@ Decimal Devises::convertir(const Decimal& amount, std::string_view from, std::st
 
 Decimal Devises::arrondir(const Decimal& amount, std::string_view ident) const {
   return Monnaie::valeurArrondie(amount, decimales(ident), "=");
+}
+
+std::string Devises::texte(const Decimal& amount, std::string_view ident) const {
+  return amountText(amount, decimales(ident));
+}
+
+Decimal Devises::saisi(std::string_view text, std::string_view ident, std::string_view what) const {
+  return typedAmount(text, decimales(ident), what);
 }
 
 void Devises::saisirCours(std::string_view ident, const Jour& day, const Decimal& rate) {

@@ -29,6 +29,19 @@ namespace host {
 class Session;
 class Snapshot;
 
+// ---- an amount in a currency of `decimals` decimals (Devises::decimales)
+// The most integer digits an amount may have: the ledger's amounts hold 15 digits
+// before the point, and anything longer is a slip of the keyboard, not an amount.
+constexpr int kAmountMaxIntegerDigits = 15;
+// The amount as people see it: exactly `decimals` decimals, rounded to the nearest,
+// ties away from zero (JPY "1500", EUR "1500.00").
+std::string amountText(const Decimal& amount, int decimals);
+// The amount a person typed, as the screen then holds and shows it: rounded to
+// `decimals` like amountText, so that what is kept is what was seen. An empty text
+// is 0. HostError naming `what` for a text that is not an amount, and for one with
+// more than kAmountMaxIntegerDigits integer digits.
+Decimal typedAmount(std::string_view text, int decimals, std::string_view what);
+
 class Devises {
  public:
   static constexpr std::string_view kReference = "EUR";
@@ -56,6 +69,9 @@ class Devises {
   Decimal convertir(const Decimal& amount, std::string_view from, std::string_view to, const Jour& day) const;
   // Rounded to the decimals of `ident`, to the nearest, ties away from zero.
   Decimal arrondir(const Decimal& amount, std::string_view ident) const;
+  // amountText and typedAmount with the decimals of `ident`.
+  std::string texte(const Decimal& amount, std::string_view ident) const;
+  Decimal saisi(std::string_view text, std::string_view ident, std::string_view what) const;
 
   // A rate the user typed for a floating currency on a day; later lookups of that day
   // in this session take it. Refused for a fixed-rate currency and for a rate <= 0.

@@ -13,7 +13,9 @@ std::string Ecran::titreDe(const std::string& object) const {
 }
 
 void Ecran::redisplay(const char* name) {
-  if (name && *name) redisplayed_.emplace_back(name);
+  if (!name || !*name) return;
+  redisplayed_.emplace_back(name);
+  pending_.insert(name);
 }
 
 void Ecran::setForbidden(const char* name, bool forbidden) {

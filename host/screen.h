@@ -40,6 +40,9 @@ class Ecran {
   std::string commandeLibelle(int n) const;
   std::string titreDe(const std::string& object) const;
   const std::vector<std::string>& affichages() const { return redisplayed_; }
+  // Whether `name` was redisplayed since the last call for it; the call forgets it,
+  // so the model shows a list again once however many times it was asked.
+  bool takeRedisplay(const std::string& name) { return pending_.erase(name) != 0; }
   bool visuDemandee() const { return visu_requested_; }
   void oublierVisu() { visu_requested_ = false; }
   const std::string& focus() const { return focus_; }
@@ -50,7 +53,7 @@ class Ecran {
   void setForbidden(const char* name, bool forbidden);
   void setHidden(const char* name, bool hidden);
 
-  std::set<std::string> forbidden_, hidden_;
+  std::set<std::string> forbidden_, hidden_, pending_;
   std::map<int, std::string> commands_;
   std::map<std::string, std::string> captions_;
   std::vector<std::string> redisplayed_;

@@ -4,6 +4,7 @@
 #include "host/session.h"
 #include "host/snapshot.h"
 #include "host/table.h"
+#include "model/shown.h"
 #include "model/step.h"
 
 namespace model {
@@ -69,6 +70,7 @@ void Scritere::fill() {
   if (keys != 1) keyColumn_ = -1;
 
   const std::string list = kList;
+  AmountDecimals decimals;
   for (int rc = main.suivant(3); rc == 0; rc = main.suivant(1)) {
     Outcome outcome = step(*this, list + "_SELECTION");
     if (outcome == Outcome::stopped) return;
@@ -76,12 +78,12 @@ void Scritere::fill() {
     Shown row;
     for (std::size_t i = 0; i < columns_.size(); ++i) {
       host::Valeur v = main.valeur(columns_[i].name);
-      row.values += v.chaine();
+      row.values += shownText(v, *this, decimals);
       row.values += '\0';
       if (static_cast<int>(i) == keyColumn_) row.key = std::move(v);
     }
     for (const host::Donnee* d : shownVariables) {
-      row.values += d->chaine();
+      row.values += shownText(d->valeur(), *this, decimals);
       row.values += '\0';
     }
     row.values.shrink_to_fit();

@@ -1,13 +1,16 @@
 #include "model/mains.h"
 
 #include <functional>
+#include <optional>
 
 #include "host/automate.h"
+#include "host/currency.h"
 #include "host/error.h"
 #include "host/registry.h"
 #include "host/table.h"
 #include "model/acces.h"
 #include "model/sdocum.h"
+#include "model/shown.h"
 #include "model/step.h"
 
 namespace model {
@@ -26,6 +29,12 @@ struct Target {
   bool listColumn = false;
   std::string branch;  // the branch run when the object is left ("" when none)
 
+  host::Genre genre() const {
+    if (variable) return variable->genre();
+    for (const host::Colonne& c : table->colonnes())
+      if (c.name == column) return c.genre;
+    return host::Genre::Texte;
+  }
   host::Valeur read() const { return variable ? variable->valeur() : table->valeur(column); }
   void write(const host::Valeur& v) const {
     if (variable)
@@ -33,15 +42,46 @@ struct Target {
     else
       table->affecter(column, v);
   }
-  void writeText(const std::string& text, const std::string& object) const {
-    if (variable) {
-      variable->affecterTexte(text);
-      return;
-    }
-    for (const host::Colonne& c : table->colonnes())
-      if (c.name == column) table->affecter(column, host::Valeur::depuisTexte(c.genre, text, object));
-  }
 };
+
+// The value a user typed into `target`, as the screen takes it: an amount with the
+// decimals of its currency, anything else read as the object's kind. Throws
+// HostError for a text the object cannot take.
+host::Valeur typedValue(Automate& screen, const Target& target, const std::string& text,
+                        const std::string& object) {
+  if (target.genre() != host::Genre::Monnaie) return host::Valeur::depuisTexte(target.genre(), text, object);
+  return host::Valeur::montant(host::euro().saisi(text, screenCurrency(screen), object));
+}
+
+// Every name under which the screen may forbid or hide `object`: a field with and
+// without its table ("MIRVAE.NUMJL", and "NUMJL" for the main table), each with and
+// without the list's prefix ("LST_MIRVAL.COTVA", "MIRVAL.COTVA"; "LST_V_HT", "V_HT").
+std::vector<std::string> namesOf(Automate& screen, const std::string& object) {
+  std::string name = object;
+  auto* document = dynamic_cast<Sdocum*>(&screen);
+  std::string list = document && !document->listName().empty() ? document->listName() + "_" : "";
+  if (!list.empty() && name.rfind(list, 0) == 0) name = name.substr(list.size());
+  std::vector<std::string> bare{name};
+  if (std::size_t dot = name.find('.'); dot != std::string::npos) {
+    host::Table* main = screen.table(false);
+    if (main && name.substr(0, dot) == main->alias()) bare.push_back(name.substr(dot + 1));
+  } else if (host::Table* main = screen.table(false); main && !main->nom().empty() && !screen.variable(name)) {
+    bare.push_back(main->alias() + "." + name);
+  }
+  std::vector<std::string> names;
+  for (const std::string& b : bare) {
+    names.push_back(b);
+    if (!list.empty()) names.push_back(list + b);
+  }
+  return names;
+}
+
+// Whether the screen forbade or hid `object` under any of its names.
+bool outOfReach(Automate& screen, const std::string& object) {
+  for (const std::string& name : namesOf(screen, object))
+    if (screen.ecran()->estInterdit(name) || screen.ecran()->estCache(name)) return true;
+  return false;
+}
 
 Target resolve(Automate& screen, const std::string& object) {
   Target t;
@@ -71,11 +111,13 @@ Target resolve(Automate& screen, const std::string& object) {
 }
 
 // The screen catches up with what the action did: an access list is refilled, a
-// document asked to switch to visualisation does.
+// document asked to switch to visualisation does, a document's list redisplayed
+// shows its lines again.
 void catchUp(Automate& screen) {
   if (screen.estTermine()) return;
   if (auto* list = dynamic_cast<Scritere*>(&screen)) list->refreshList();
   if (auto* document = dynamic_cast<Saisie*>(&screen)) document->applyVisuRequest();
+  if (auto* document = dynamic_cast<Sdocum*>(&screen); document && !document->estTermine()) document->catchUpList();
 }
 
 // One user action on the screen in front: `body` returns whether it was accepted.
@@ -139,11 +181,23 @@ void fermer(Session& session) {
 }
 
 bool saisir(Session& session, const std::string& object, const std::string& text) {
-  Target target = resolve(ecranDevant(session), object);
-  return act(session, "saisie", object + " = " + text, object, [&](Automate& a) {
+  Automate& screen = ecranDevant(session);
+  Target target = resolve(screen, object);
+  // The value is taken as the screen will show it, and recorded so.
+  std::optional<host::Valeur> typed;
+  std::string refusal;
+  try {
+    typed = typedValue(screen, target, text, object);
+  } catch (const HostError& error) {
+    refusal = error.what();
+  }
+  AmountDecimals decimals;
+  std::string shown = typed && typed->genre() == host::Genre::Monnaie ? shownText(*typed, screen, decimals) : text;
+  return act(session, "saisie", object + " = " + shown, object, [&](Automate& a) {
     auto* document = dynamic_cast<Sdocum*>(&a);
     auto* saisie = dynamic_cast<Saisie*>(&a);
-    if (a.ecran()->estInterdit(object) || a.ecran()->estCache(object)) return false;
+    // Nothing of the screen runs for an object it put out of reach.
+    if (outOfReach(a, object)) return false;
     if (saisie && saisie->modeCourant() != "C" && saisie->modeCourant() != "M") return false;
     if (target.listColumn) {
       if (!document || !document->beginLineChange()) return false;
@@ -154,14 +208,13 @@ bool saisir(Session& session, const std::string& object, const std::string& text
     host::EvtParamRef about(1, &control);
     if (step(a, "CTRL_DEBUT_MODIF", &about) != Outcome::accepted) return false;
     if (!target.branch.empty() && step(a, target.branch + "_ENTREE") != Outcome::accepted) return false;
-    host::Valeur before = target.read();
-    try {
-      target.writeText(text, object);
-    } catch (const HostError& error) {
-      a.BoiteMessage(error.what(), 0, nullptr);
+    if (!typed) {
+      a.BoiteMessage(refusal, 0, nullptr);
       a.controler(object.c_str(), "");
       return false;
     }
+    host::Valeur before = target.read();
+    target.write(*typed);
     if (target.branch.empty()) return true;
     if (step(a, target.branch) != Outcome::refused) return true;
     target.write(before);
@@ -175,7 +228,7 @@ bool appuyer(Session& session, const std::string& action) {
   if (!screen.aBranche(action)) throw HostError("action « " + action + " » inconnue de l'écran « " + screen.code() + " »");
   return act(session, "action", action, action, [&](Automate& a) {
     // A button the screen disabled or hid cannot be pressed.
-    if (a.ecran()->estInterdit(action) || a.ecran()->estCache(action)) return false;
+    if (outOfReach(a, action)) return false;
     return step(a, action) != Outcome::refused;
   });
 }
@@ -184,6 +237,8 @@ bool ouvrirChoix(Session& session, const std::string& object) {
   Target target = resolve(ecranDevant(session), object);
   const char* event = target.listColumn ? "CTRL_OUVRE" : "CTRL_CHOISIR";
   return act(session, "action", "choix " + object, object, [&](Automate& a) {
+    // A control out of reach opens no choice window.
+    if (outOfReach(a, object)) return false;
     host::Chaine control(object);
     host::EvtParamRef about(1, &control);
     return step(a, event, &about) != Outcome::refused;
@@ -228,7 +283,9 @@ bool choisirLigne(Session& session, int n) {
 }
 
 std::string valeur(Session& session, const std::string& object) {
-  return resolve(ecranDevant(session), object).read().chaine();
+  Automate& screen = ecranDevant(session);
+  AmountDecimals decimals;
+  return shownText(resolve(screen, object).read(), screen, decimals);
 }
 
 }  // namespace model

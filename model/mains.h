@@ -4,7 +4,7 @@
 // Each call is one user action (Session::action): what it writes lands whole or
 // not at all, the procedures it queues run before it ends, and the screen then
 // catches up (an access list is refilled, a document asked to switch to
-// visualisation does). Each is recorded in the session's transcript: "saisie"
+// visualisation does, a document's list redisplayed shows its lines again). Each is recorded in the session's transcript: "saisie"
 // (object = text), "action" (the action, a list move), "refus" (the object or
 // action refused, with the control that has the focus). A call returns true when
 // the action was accepted, false when it was refused or failed (a failure is in the
@@ -40,15 +40,21 @@ bool ouvrir(host::Session& session, const std::string& name);
 void fermer(host::Session& session);
 
 // Types `text` into `object`, then runs the branch of that object if the screen
-// has one ("<branch>_ENTREE" first, when it exists). Refused (the previous value is
-// put back, the focus stays) when the object is forbidden, when the document is in
-// visualisation, or when the branch rejects the input.
+// has one ("<branch>_ENTREE" first, when it exists). An amount is taken with the
+// decimals of the screen's currency (model/shown.h), as the screen then shows it,
+// and recorded so. Refused (the previous value is put back, the focus stays) when
+// the screen forbade or hid the object under any of its names ("MIRVAE.NUMJL" is
+// "NUMJL" on the MIRVAE screen, "LST_MIRVAL.COTVA" is "MIRVAL.COTVA"), before any
+// handler runs; when the document is in visualisation; when the text is not a value
+// of the object's kind (an amount beyond 15 integer digits is none), with a message;
+// or when the branch rejects the input.
 bool saisir(host::Session& session, const std::string& object, const std::string& text);
 // Presses an action: runs the branch of that name ("GERER", "B_VALID_DOC").
-// Refused when the screen disabled or hid it.
+// Refused when the screen disabled or hid it, under any of its names.
 bool appuyer(host::Session& session, const std::string& action);
 // Asks for the choice window of a control: "CTRL_OUVRE" for a list column,
-// "CTRL_CHOISIR" otherwise, with the control's name.
+// "CTRL_CHOISIR" otherwise, with the control's name. Refused when the screen
+// disabled or hid the control.
 bool ouvrirChoix(host::Session& session, const std::string& object);
 
 // The list of a document (model/sdocum.h for the steps each runs).

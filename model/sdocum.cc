@@ -6,6 +6,7 @@
 #include "host/error.h"
 #include "host/session.h"
 #include "host/snapshot.h"
+#include "model/shown.h"
 #include "model/step.h"
 
 namespace model {
@@ -117,7 +118,8 @@ void Sdocum::showLine(const std::string& numero) {
   if (step(*this, "SELECTION") == Outcome::stopped) return;
   auto& shown = shown_variables_[numero];
   shown.clear();
-  for (const Donnee* d : variables()) shown[d->nom()] = d->chaine();
+  AmountDecimals decimals;
+  for (const Donnee* d : variables()) shown[d->nom()] = shownText(d->valeur(), *this, decimals);
 }
 
 // ---------------------------------------------------------------------------- storage
@@ -391,18 +393,37 @@ bool Sdocum::deleteLine() {
   return step(*this, "APRES_SUPPRESSION_LIGNE") != Outcome::stopped;
 }
 
+void Sdocum::catchUpList() {
+  if (!line_ || !ecran()->takeRedisplay(list_)) return;
+  Record inEntry = recordOf(*line_);
+  for (const std::string& n : imageNumeros()) {
+    if (current_ && *current_ == n) continue;
+    readImageLine(n);
+    showLine(n);
+    if (stopped(*this)) return;
+  }
+  line_->raz();
+  for (const auto& [name, value] : inEntry) line_->affecter(name, value);
+  if (!current_) return;
+  if (current_->empty())
+    step(*this, "SELECTION");
+  else
+    showLine(*current_);
+}
+
 bool Sdocum::abandonLine() { return step(*this, "APRES_ABANDON_LIGNE") != Outcome::stopped; }
 
 std::vector<RowText> Sdocum::rows() {
   std::vector<RowText> out;
   if (!line_) return out;
   Table& img = image();
+  AmountDecimals decimals;
   for (const std::string& n : imageNumeros()) {
     Champ key("NUMERO", &img);
     img.lit(3, key, '=', Valeur::texte(n));
     RowText row;
     for (const Colonne& c : img.colonnes()) {
-      std::string text = img.valeur(c.name).chaine();
+      std::string text = shownText(img.valeur(c.name), *this, decimals);
       row[line_->alias() + "." + c.name] = text;
       row[c.name] = text;
     }

@@ -126,6 +126,10 @@ class Sdocum : public Setape {
   bool beginLineChange();
   // The focus is back in the header: the list will be entered again.
   void leaveList() { in_list_ = false; }
+  // When a handler redisplayed the list, shows every line again ("SELECTION" per
+  // line, so that what a line shows follows the header, the amount mode or the
+  // currency), the current one last and as it stands in entry.
+  void catchUpList();
 
   void keepState(host::Snapshot& snapshot) override;
 

@@ -1,9 +1,12 @@
 // The currency of a client invoice: a change of currency converts the lines once the
 // user confirmed it, a fixed rate cannot be typed, a typed rate converts nothing, a
 // saved operation keeps its rate, and no change is made in visualisation or while a
-// line is being typed.
+// line is being typed. Amounts show and are typed with their currency's decimals.
 #include <gtest/gtest.h>
 
+#include <sstream>
+
+#include "app/exports.h"
 #include "host/currency.h"
 #include "tests/entry/gestion1_fixture.h"
 
@@ -38,8 +41,9 @@ TEST_F(DevisesTest, ChangingTheCurrencyOfADocumentWithLinesAsksThenConvertsOrKee
   } cases[] = {
       // 15/03/2024: 1.105 dollars, 156.33 yen for one euro.
       {"dollars", "USD", true, "USD 1.105", "110.50 22.10 132.60 / 55.25 0.00 55.25 / 165.75 22.10 187.85"},
-      // No decimals in yen: 3126.6 and 7816.5 round to the nearest, halves away from zero.
-      {"yens", "JPY", true, "JPY 156.33", "15633.00 3127.00 18760.00 / 7817.00 0.00 7817.00 / 23450.00 3127.00 26577.00"},
+      // No decimals in yen: 3126.6 and 7816.5 round to the nearest, halves away from zero,
+      // and the amounts show none.
+      {"yens", "JPY", true, "JPY 156.33", "15633 3127 18760 / 7817 0 7817 / 23450 3127 26577"},
       {"refusé", "USD", false, "EUR 1", "100.00 20.00 120.00 / 50.00 0.00 50.00 / 150.00 20.00 170.00"},
   };
   for (const auto& c : cases) {
@@ -141,6 +145,58 @@ TEST_F(DevisesTest, NoChangeInVisualisationNorWhileALineIsTyped) {
   EXPECT_EQ(questions(), 0u);
   EXPECT_EQ(valeur("MIRVAE.MONNAIE_IDENT") + " " + host::euro().courante(), "EUR EUR");
   EXPECT_EQ(model::lignes(session())[0]["MIRVAL.HT"], "100.00");
+}
+
+TEST_F(DevisesTest, ATypedAmountTakesTheDecimalsOfItsCurrencyAndOneTooLargeIsRefused) {
+  const struct {
+    const char* currency;
+    const char* typed;
+    const char* shown;  // "" when refused
+  } cases[] = {
+      {"EUR", "0.005", "0.01"},    {"EUR", "-0.005", "-0.01"},   {"EUR", "0.0049", "0.00"},
+      {"EUR", "1500", "1500.00"},  {"JPY", "1500", "1500"},      {"JPY", "1000.5", "1001"},
+      {"XPF", "0.49", "0"},        {"EUR", "999999999999999.99", "999999999999999.99"},
+      {"EUR", "1000000000000000", ""},
+      {"EUR", "12345678901234567890123456789012345678", ""},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(std::string(c.currency) + " " + c.typed);
+    ASSERT_TRUE(creer());
+    ASSERT_TRUE(saisir("MIRVAE.MONNAIE_IDENT", c.currency));
+    ASSERT_TRUE(client());
+    ASSERT_TRUE(model::nouvelleLigne(session()));
+    ASSERT_TRUE(saisir("LST_MIRVAL.NUMCP", "758000"));
+    bool accepted = *c.shown != 0;
+    EXPECT_EQ(saisir("LST_V_HT", c.typed), accepted);
+    if (accepted) {
+      // What the line keeps is what the screen shows and the transcript recorded.
+      EXPECT_EQ(valeur("LST_V_HT"), c.shown);
+      EXPECT_EQ(valeur("LST_MIRVAL.HT"), c.shown);
+      EXPECT_EQ(session().transcript().textes("saisie").back(), std::string("LST_V_HT = ") + c.shown);
+    } else {
+      EXPECT_NE(dernierMessage().find("est trop grand : 15 chiffres au plus avant la virgule"), std::string::npos)
+          << dernierMessage();
+      EXPECT_LT(dernierMessage().size(), 200u);
+    }
+    model::fermer(session());
+  }
+}
+
+TEST_F(DevisesTest, TheLedgerListingAndTheExportShowTheDecimalsOfTheKeepingCurrency) {
+  sql("UPDATE PARAM SET MONNAIE_IDENT = 'XPF'");
+  base().exec(
+      "INSERT INTO PIECE (NPIES, NPIEC, NUMJL, DTOPE, INPIE, MONNAIE_IDENT) VALUES "
+      "('00000000001', 'VT1', 'VT', '2024-03-15', 'Facture', 'XPF');"
+      "INSERT INTO MOUVE (NPIES, NLIGS, NUMCP, LIBEC, MTDEB, MTCRE) VALUES "
+      "('00000000001', '1', '411001', 'Facture', '1794', '0'), ('00000000001', '2', '706300', 'Facture', '0', '1794');"
+      "INSERT INTO ECHEA (NUSYS, NPIES, DTECH, MTECH) VALUES ('1', '00000000001', '2024-03-15', '1794')");
+  std::ostringstream listing, hledger;
+  app::imprimerGrandLivre(base(), listing);
+  app::exporterHledger(base(), hledger);
+  EXPECT_NE(listing.str().find("échéance du 2024-03-15 : 1794\n"), std::string::npos) << listing.str();
+  EXPECT_NE(listing.str().find("débit 1794 XPF, crédit 1794 XPF"), std::string::npos) << listing.str();
+  EXPECT_NE(hledger.str().find("411001    1794 XPF"), std::string::npos) << hledger.str();
+  EXPECT_EQ(listing.str().find("1794.00"), std::string::npos) << listing.str();
 }
 
 }  // namespace

@@ -85,6 +85,37 @@ TEST_F(DocumentTest, CurrencyTakesItsRateOfTheDayAndAFixedRateCannotBeTyped) {
   EXPECT_EQ(valeur("MIRVAE.MONNAIE_IDENT"), "USD");
 }
 
+TEST_F(DocumentTest, AForbiddenObjectIsRefusedUnderEveryNameBeforeAnyHandlerRuns) {
+  operationEnregistree("00000931");
+  ASSERT_TRUE(ouvrirFiche("00000931", "VMCAm"));
+  ASSERT_EQ(mode(), "M");
+  // The journal of a saved operation and the rate of a fixed-rate currency.
+  const struct {
+    const char* object;
+    const char* typed;
+    const char* kept;
+  } cases[] = {{"MIRVAE.NUMJL", "VX", "VT"}, {"LST_MIRVAE.NUMJL", "VX", "VT"}, {"MIRVAE.COURS", "2", "1"}};
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.object);
+    std::size_t errors = session().transcript().textes("erreur").size();
+    EXPECT_FALSE(saisir(c.object, c.typed));
+    EXPECT_EQ(valeur(c.object), c.kept);
+    EXPECT_EQ(session().transcript().textes("erreur").size(), errors);
+  }
+  EXPECT_EQ(sql("SELECT NUMJL FROM MIRVAE WHERE IDENT = '00000931'"), "VT");
+}
+
+TEST_F(DocumentTest, ANewOperationTakesTheFirstSalesJournalWhateverWasOpenedBefore) {
+  operationEnregistree("00000932");
+  sql("UPDATE MIRVAE SET NUMJL = 'VX' WHERE IDENT = '00000932'");
+  ASSERT_TRUE(ouvrirFiche("00000932", "VMCAv"));
+  ASSERT_EQ(valeur("MIRVAE.NUMJL"), "VX");
+  ASSERT_TRUE(appuyer("CREATION"));
+  ASSERT_EQ(mode(), "C");
+  EXPECT_EQ(valeur("MIRVAE.NUMJL"), "VT");
+  EXPECT_EQ(valeur("MIRVAE.NPIEC"), "[PIECE]");
+}
+
 TEST_F(DocumentTest, AbandoningTheDialogSavesNothing) {
   ASSERT_TRUE(facture());
   enregistrer("0");

@@ -54,14 +54,25 @@ TEST_F(LignesTest, TheTypedAmountGivesTheOtherTwoWithOnlyTheVatRounded) {
   }
 }
 
-TEST_F(LignesTest, IncludingTaxSwapsTheColumnCaptions) {
+TEST_F(LignesTest, IncludingTaxSwapsTheColumnCaptionsAndEveryLineAtOnce) {
   ASSERT_TRUE(creer());
   EXPECT_EQ(ecran().ecran()->titreDe("LST_V_HT"), "Mtt HT");
   EXPECT_EQ(ecran().ecran()->titreDe("LST_V_TTC"), "Mtt TTC");
+  ASSERT_TRUE(client());
+  ASSERT_TRUE(ligne("708500", "100"));
+  ASSERT_TRUE(ligne("758000", "50"));
+  ASSERT_TRUE(model::allerLigne(session(), 2));
   ASSERT_TRUE(saisir("MIRVAE.SAISIE_MTT", "2"));
   EXPECT_EQ(ecran().ecran()->titreDe("LST_V_HT"), "Mtt TTC");
   EXPECT_EQ(ecran().ecran()->titreDe("LST_V_TTC"), "Mtt HT");
   EXPECT_EQ(valeur("V_SAISIE_MTT"), "TTC");
+  // Every line shows its amounts in the new mode, not only the one gone back to.
+  std::string shown;
+  for (auto& row : model::lignes(session())) shown += row["V_HT"] + " " + row["V_TTC"] + " / ";
+  EXPECT_EQ(shown, "120.00 100.00 / 50.00 50.00 / ");
+  // The current line is still the one the user is on.
+  EXPECT_EQ(valeur("LST_MIRVAL.NUMCP") + " " + valeur("VLIBCP2"),
+            "758000 " + sql("SELECT LIBCP FROM COMPT WHERE NUMCP = '758000'"));
 }
 
 TEST_F(LignesTest, AnOvertypedVatIsKeptAndOnlyTheOtherAmountFollows) {
@@ -152,6 +163,10 @@ TEST_F(LignesTest, WithoutVatManagementLinesCarryNoVatAndItsColumnsAreForbidden)
   EXPECT_EQ(valeur("LST_MIRVAL.TTC"), "100.00");
   EXPECT_FALSE(saisir("LST_MIRVAL.COTVA", "V20"));
   EXPECT_FALSE(saisir("LST_MIRVAL.TVA", "20"));
+  // Named without the list, or through its choice window, the column is as out of reach.
+  EXPECT_FALSE(saisir("MIRVAL.COTVA", "V20"));
+  EXPECT_FALSE(model::ouvrirChoix(session(), "LST_MIRVAL.COTVA"));
+  EXPECT_EQ(valeur("LST_MIRVAL.COTVA"), "");
 }
 
 TEST_F(LignesTest, TotalsFollowTheLinesAndFallBackToTheSavedOnes) {

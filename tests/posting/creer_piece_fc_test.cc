@@ -1,5 +1,7 @@
 #include "posting/creer_piece_fc.h"
 
+#include <algorithm>
+
 #include <gtest/gtest.h>
 
 #include "host/registry.h"
@@ -128,6 +130,46 @@ TEST_F(CreerPieceFcTest, FailedLineEndsTheLinesButNotThePiece) {
                                  "360.00, crédit 120.00."}));
   EXPECT_EQ(compte("SELECT count(*) FROM PIECE"), 0);
   EXPECT_EQ(compte("SELECT count(*) FROM MOUVE"), 0);
+}
+
+TEST_F(CreerPieceFcTest, AFailedAnalyticRowEndsItsLineAndAFailedDueDateEndsThePiece) {
+  const struct {
+    const char* procedure;
+    Strings tail;  // the calls from the failed one on
+  } cases[] = {
+      // One analytic call only, the line ended, the next lines still sent.
+      {"ANALYTIQUE",
+       {"ANALYTIQUE", "FIN_LIGNE", "DEBUT_LIGNE 445800", "FIN_LIGNE", "DEBUT_LIGNE 411001", "ECHEANCE", "FIN_LIGNE",
+        "FIN_PIECE"}},
+      // Nothing is sent after the due date.
+      {"ECHEANCE", {"ECHEANCE", "FIN_PIECE"}},
+  };
+  int n = 0;
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.procedure);
+    std::string ident = "OP00001" + std::to_string(++n);
+    ecrire({.ident = ident,
+            .lignes = {{"706000", "100", "20", "V20", {{"ATELIER", "0", "60"}, {"CHANTIER", "0", "40"}}}}});
+    appels_.clear();
+    echouer(c.procedure, 1, 7);
+    poster(ident);
+    auto from = std::find(appels_.begin(), appels_.end(), c.procedure);
+    ASSERT_NE(from, appels_.end());
+    Strings sent(from, std::find(from, appels_.end(), "FIN_PIECE") + 1);
+    EXPECT_EQ(sent, c.tail);
+  }
+}
+
+TEST_F(CreerPieceFcTest, TheDueDateHangsOnTheTiersMovementOfItsOwnPiece) {
+  ecrire({.ident = "OP000001", .lignes = {{"706000", "100"}}});
+  poster("OP000001");
+  ecrire({.ident = "OP000002", .lignes = {{"706000", "50"}, {"707000", "30"}}});
+  poster("OP000002");
+  std::string second = npies("OP000002");
+  EXPECT_EQ(sql("SELECT ECHEA.INDX1 = MOUVE.UNIQ FROM ECHEA JOIN MOUVE ON MOUVE.NPIES = ECHEA.NPIES "
+                "WHERE MOUVE.NUMCP = '411001' AND ECHEA.NPIES = '" + second + "'"),
+            "1");
+  EXPECT_NE(sql("SELECT INDX1 FROM ECHEA WHERE NPIES = '" + second + "'"), "1");
 }
 
 TEST_F(CreerPieceFcTest, NpiesReplacedAsSoonAsDebutPieceSucceeds) {
