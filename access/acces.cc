@@ -6,10 +6,10 @@
 
 namespace browser {
 
-MIRVAEAcces::MIRVAEAcces(Evt* e, const GenreAcces& genre) : Acces2(e), genre_(genre) {
+MIRVAEAcces::MIRVAEAcces(Evt* e, const registry::OperationKind& kind) : Acces2(e), kind_(kind) {
   nomBase("CP");
   nomLibelles("LIBE1", "LIBEL");
-  nomEcran(genre_.ecran().c_str());
+  nomEcran(kind_.accessScreen().c_str());
   nomTable("MIRVAE", nullptr);
 
   addBranch("INIT", &MIRVAEAcces::init);
@@ -126,7 +126,7 @@ void MIRVAEAcces::debut(Evt* e) {
   VNUMCP_TOUS = "O";
 
   COMPT1.initRequete();
-  COMPT1.ajouteFiltre(COMPT1_NATUC, '?', genre_.nature, 'A');
+  COMPT1.ajouteFiltre(COMPT1_NATUC, '?', kind_.headerNature, 'A');
   COMPT1.ajouteFiltre(COMPT1_CCTRA, '#', "O", 'A');
   COMPT1.choisitIndex("LIBCP", 'A');
   COMPT1.activeRequete();
@@ -212,7 +212,7 @@ void MIRVAEAcces::vlibcp1(Evt* e) {
     VNUMCP_TOUS = "O";
   } else {
     if (COMPT1.lit(3, COMPT1_LIBCP, '=', VLIBCP1) != 0) {
-      messageOk(genre_.compteInexistant);
+      messageOk(kind_.headerMissing);
       controler("VLIBCP1", "");
       rejeter(e);
       return;
@@ -225,7 +225,7 @@ void MIRVAEAcces::vlibcp1(Evt* e) {
 }
 
 void MIRVAEAcces::compt1_choisir(Evt*) {
-  EvtParamRef evt(5, &VLIBCP1, &COMPT1_LIBCP, genre_.nature, "LIBCP", "N");
+  EvtParamRef evt(5, &VLIBCP1, &COMPT1_LIBCP, kind_.headerNature, "LIBCP", "N");
   appelerProcedure("*", "CPCOMPT", "INTERFACE", "CHOIX_INTITULE_REDUIT", &evt, -1);
   appelerProcedure("", "", "", "VLIBCP1", nullptr, 0);
 }
@@ -248,7 +248,7 @@ void MIRVAEAcces::active_requete(Evt* e) {
   Scritere::active_requete(e);
   Table& main = *table(false);
   main.initRequete();
-  main.ajouteFiltre(TYPE, '=', genre_.type, 'A');
+  main.ajouteFiltre(TYPE, '=', kind_.type, 'A');
   if (VDATE_DEBUT) main.ajouteFiltre(DTOPE, '+', VDATE_DEBUT, 'A');
   if (VDATE_FIN) main.ajouteFiltre(DTOPE, '-', VDATE_FIN, 'A');
   if (VNUMCP1) main.ajouteFiltre(NUMCP, '=', VNUMCP1, 'A');
@@ -275,7 +275,7 @@ void MIRVAEAcces::lst_selection(Evt* e) {
     VLIBCP2 = COMPT2_LIBCP;
   } else {
     COMPT2.raz();
-    VLIBCP2 = genre_.titreInexistant + NUMCP + "> inexistant !";
+    VLIBCP2 = kind_.rowUnknownTitle + NUMCP + "> inexistant !";
   }
 }
 
@@ -292,7 +292,7 @@ void MIRVAEAcces::controler_dossier(Evt* e) {
     EvtParamRef question(1, libelle("02401") + libelle("024011"));
     appelerProcedure("*", "CPMESSAG", "INTERFACE", "MESS_ON", &question, -1);
     if (erreurMethode() == 1) {
-      Chaine moduleName(genre_.module());
+      Chaine moduleName(kind_.accessModule());
       EvtParamRef evt(1, &moduleName);
       appelerModule("", "COMPTA", "LANCE_REOUVERTURE_ANNU", &evt);
       PARAM.lit(3, PARAM_PNUME, '=', Valeur::entier(1));
@@ -310,7 +310,7 @@ void MIRVAEAcces::controler_dossier(Evt* e) {
 void MIRVAEAcces::ouvrirGestion(const char* mode) {
   Chaine V_MODE("V_MODE", "", "", 4, nullptr);
   V_MODE = mode;
-  lancerModule("", "MIRVAE", genre_.gestion().c_str(), new EvtParamVal(2, &IDENT, &V_MODE));
+  lancerModule("", "MIRVAE", kind_.entryModule().c_str(), new EvtParamVal(2, &IDENT, &V_MODE));
 }
 
 void MIRVAEAcces::gerer(Evt*) {
@@ -335,7 +335,7 @@ void MIRVAEAcces::creer(Evt*) {
 void MIRVAEAcces::impr_fiche(Evt*) {
   Chaine V_REQUETE("V_REQUETE", "", "", 4, nullptr);
   V_REQUETE = model::requeteFiche(IDENT.chaine());
-  Chaine name(genre_.fiche());
+  Chaine name(kind_.printForm());
   EvtParamRef evt(2, &name, &V_REQUETE);
   appelerProcedure("*", "MIRVAE", "INTERFACE", "IMPRESSION", &evt, -1);
 }
@@ -343,7 +343,7 @@ void MIRVAEAcces::impr_fiche(Evt*) {
 void MIRVAEAcces::impr_liste(Evt*) {
   Chaine V_REQUETE("V_REQUETE", "", "", 4, nullptr);
   V_REQUETE = table(false)->requete();
-  Chaine name(genre_.liste());
+  Chaine name(kind_.printList());
   EvtParamRef evt(2, &name, &V_REQUETE);
   appelerProcedure("*", "MIRVAE", "INTERFACE", "IMPRESSION", &evt, -1);
 }

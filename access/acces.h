@@ -2,10 +2,11 @@
 // piece number and posting state, with the actions that open the entry screen,
 // print, and show the ledger piece.
 //
-// MIRVAEAcces holds the whole behaviour; a kind's screen passes its GenreAcces.
+// MIRVAEAcces holds the whole behaviour; a kind's screen passes its row of the
+// operation-kind table.
 #pragma once
 
-#include "access/genres.h"
+#include "registry/operation_kinds.h"
 #include "host/table.h"
 #include "model/acces.h"
 
@@ -15,7 +16,7 @@ using namespace host;
 
 class MIRVAEAcces : public model::Acces2 {
  public:
-  MIRVAEAcces(Evt* e, const GenreAcces& genre);
+  MIRVAEAcces(Evt* e, const registry::OperationKind& kind);
 
   void init(Evt* e) override;
   void debut_activation(Evt* e) override;
@@ -45,10 +46,10 @@ class MIRVAEAcces : public model::Acces2 {
   void controler_dossier(Evt* e);
   void visu_piece(Evt* e);
 
-  const GenreAcces& genre() const { return genre_; }
+  const registry::OperationKind& kind() const { return kind_; }
 
  protected:
-  const GenreAcces& genre_;
+  const registry::OperationKind& kind_;
 
   // Variables
   Chaine VMOIAN{"VMOIAN", "", "", 0, this};
@@ -121,7 +122,7 @@ class MIRVAEAcces : public model::Acces2 {
 
 class MIRVAEAcces1 : public MIRVAEAcces {
  public:
-  explicit MIRVAEAcces1(Evt* e) : MIRVAEAcces(e, kFacturesClients) {}
+  explicit MIRVAEAcces1(Evt* e) : MIRVAEAcces(e, registry::operationKind(1)) {}
 };
 
 }  // namespace browser

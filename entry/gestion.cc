@@ -16,7 +16,7 @@ constexpr const char* kPlaceholder = "[PIECE]";
 
 }  // namespace
 
-EntryScreen::EntryScreen(Evt* e, const EntryKind& kind) : Gestion_document2(e), kind_(kind) {
+EntryScreen::EntryScreen(Evt* e, const registry::OperationKind& kind) : Gestion_document2(e), kind_(kind) {
   Evt* launch = lancement();
   if (launch->nbParams() > 0) {
     launch->param(0, PIDENT, 0);
@@ -24,7 +24,7 @@ EntryScreen::EntryScreen(Evt* e, const EntryKind& kind) : Gestion_document2(e), 
   }
   nomBase("CP");
   nomLibelles("LIBE1", "LIBEL");
-  nomEcran(kind_.screen);
+  nomEcran(kind_.entryScreen().c_str());
   modeSaisie(PMODE);
   nomTable("MIRVAE", nullptr);
   planTri("($TRI$", "INDX1");
@@ -71,10 +71,10 @@ bool EntryScreen::lireJournal() { return lireOuVider(JONAL, JONAL_NUMJL, MIRVAE_
 // Opening an operation moved JONAL to its journal: a new operation never inherits it.
 void EntryScreen::readCreationJournal() {
   switch (kind_.journal) {
-    case CreationJournal::FirstOfNature:
+    case registry::CreationJournal::FirstOfNature:
       if (JONAL.suivant(3) != 0) JONAL.raz();
       return;
-    case CreationJournal::OfFirstTreasury: {
+    case registry::CreationJournal::OfFirstTreasury: {
       // The header accounts' selection holds the kind's treasury accounts.
       Champ cptre("CPTRE", &JONAL);
       if (COMPT1.suivant(3) != 0 || JONAL.lit(3, cptre, '=', COMPT1_NUMCP) != 0) JONAL.raz();
@@ -234,7 +234,7 @@ void EntryScreen::imprime(Evt*) { procedure("IMPR_FICHE"); }
 void EntryScreen::impr_fiche(Evt*) {
   Chaine V_REQUETE("V_REQUETE", "", "", 4, this);
   V_REQUETE = model::requeteFiche(MIRVAE_IDENT.chaine());
-  EvtParamVal impression(2, kind_.printForm, &V_REQUETE);
+  EvtParamVal impression(2, kind_.printForm(), &V_REQUETE);
   appelerProcedure("*", "MIRVAE", "INTERFACE", "IMPRESSION", &impression, -1);
 }
 
@@ -288,7 +288,7 @@ void EntryScreen::debut_creation(Evt* e) {
   if (MIRVAE_DTOPE > DATE_CLOTURE || MIRVAE_DTOPE < PARAM_PDDEX) MIRVAE_DTOPE = "";
   if (JONAL_NUMEROPI == "A") MIRVAE_NPIEC = kPlaceholder;
 
-  if (kind_.currency == CreationCurrency::Dossier)
+  if (kind_.currency == registry::CreationCurrency::Dossier)
     MIRVAE_MONNAIE_IDENT = PARAM_MONNAIE_IDENT;
   else
     MIRVAE_MONNAIE_IDENT = JONAL.valeur("MONNAIE_IDENT");
@@ -297,9 +297,9 @@ void EntryScreen::debut_creation(Evt* e) {
 
   if (JONAL_PREFIXIN.estVide()) MIRVAE_INPIE = kind_.defaultLabel;
   switch (kind_.dueDate) {
-    case CreationDueDate::OperationDate: MIRVAE_DTECH = MIRVAE_DTOPE; break;
-    case CreationDueDate::Today: MIRVAE_DTECH = Date::dateCourante(); break;
-    case CreationDueDate::None: break;
+    case registry::CreationDueDate::OperationDate: MIRVAE_DTECH = MIRVAE_DTOPE; break;
+    case registry::CreationDueDate::Today: MIRVAE_DTECH = Date::dateCourante(); break;
+    case registry::CreationDueDate::None: break;
   }
   MIRVAE_COURS = euro().cours(MIRVAE_MONNAIE_IDENT.chaine(), MIRVAE_DTOPE.jour());
 
@@ -429,7 +429,7 @@ void EntryScreen::apres_validation(Evt* e) {
   Chaine VIDENT("VIDENT", "", "", 4, this);
   VIDENT = MIRVAE_IDENT;
   EvtParamVal comptabilisation(1, &MIRVAE_IDENT);
-  appelerModule("", "MIRVAE", kind_.postingModule, &comptabilisation);
+  appelerModule("", "MIRVAE", kind_.postingModule().c_str(), &comptabilisation);
   // The posting wrote the new piece number into the header.
   if (table(false)->lit(3, MIRVAE_IDENT, '=', VIDENT) != 0)
     throw HostError("l'opération « " + VIDENT.chaine() + " » a disparu pendant sa comptabilisation");

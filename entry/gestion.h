@@ -3,7 +3,7 @@
 // line, the piece numbering of its journal, the checks before saving, and the
 // posting to the ledger after each save.
 //
-// The kind's constants and texts come from its EntryKind row (entry/kinds.h); each
+// The kind's constants and texts come from its row of the operation-kind table (registry/operation_kinds.h); each
 // registered class ("MIRVAE-GESTION1" ...) is this screen built with its row, plus
 // its own branch table and the few handlers its kind adds.
 //
@@ -25,7 +25,7 @@
 #include <functional>
 #include <string>
 
-#include "entry/kinds.h"
+#include "registry/operation_kinds.h"
 #include "host/table.h"
 #include "model/gestion_document.h"
 
@@ -38,9 +38,9 @@ class EntryScreen : public model::Gestion_document2 {
   // Declares the variables, tables and fields, reads the launch parameters
   // (identifier, mode string) and configures the document. The branch table is the
   // registered class's.
-  EntryScreen(Evt* e, const EntryKind& kind);
+  EntryScreen(Evt* e, const registry::OperationKind& kind);
 
-  const EntryKind& kind() const { return kind_; }
+  const registry::OperationKind& kind() const { return kind_; }
 
   // ---- start, record, modes (lifecycle)
   void init(Evt* e) override;
@@ -200,7 +200,7 @@ class EntryScreen : public model::Gestion_document2 {
   // amount through `atNewRate`.
   void copyAnalyticRows(const std::string& source, const std::function<Decimal(const Donnee&)>& atNewRate);
 
-  const EntryKind& kind_;
+  const registry::OperationKind& kind_;
 
   // ---- launch parameters
   Chaine PIDENT{"PIDENT", "", "", 0, this};

@@ -102,6 +102,6 @@ constexpr Branche kBranches[] = {
 
 }  // namespace
 
-MIRVAEGestion1::MIRVAEGestion1(host::Evt* e) : EntryScreen(e, entry::entryKind(1)) {
+MIRVAEGestion1::MIRVAEGestion1(host::Evt* e) : EntryScreen(e, registry::operationKind(1)) {
   for (const Branche& branche : kBranches) addBranch(branche.event, branche.handler);
 }

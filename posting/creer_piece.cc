@@ -14,7 +14,7 @@ std::unique_ptr<Evt> vide() { return std::make_unique<EvtParamVal>(new InfoCode(
 
 }  // namespace
 
-PostingProcess::PostingProcess(Evt* e, const PostingKind& kind) : Traitmnt(e), kind_(kind) {
+PostingProcess::PostingProcess(Evt* e, const registry::OperationKind& kind) : Traitmnt(e), kind_(kind) {
   nomBase("CP");
   nomLibelles("LIBE1", "LIBEL");
   nomTable("MIRVAE", nullptr);
@@ -28,7 +28,18 @@ void PostingProcess::debut(Evt* e) {
 }
 
 void PostingProcess::faire(Evt* e) {
-  if (table(false)->lit(3, MIRVAE_IDENT, '=', P_IDENT) == 0) procedure("FAIT_IMPORT_PIECE");
+  if (table(false)->lit(3, MIRVAE_IDENT, '=', P_IDENT) == 0) {
+    // The header is read by its identifier alone: another kind's operation would be
+    // posted with this kind's sides and accounts.
+    if (MIRVAE_TYPE != kind_.type) {
+      BoiteMessage("L'opération " + P_IDENT.chaine() + " est de type « " + MIRVAE_TYPE.chaine() +
+                       " » : elle ne peut être comptabilisée comme une opération de type « " + kind_.type + " ».",
+                   0, nullptr);
+      V_FLAG_E = 1;
+    } else {
+      procedure("FAIT_IMPORT_PIECE");
+    }
+  }
   sortir(e, 0);
 }
 
@@ -52,7 +63,7 @@ void PostingProcess::fait_import_piece(Evt*) {
   envoyerLignes();
 
   lireCompte(MIRVAE_NUMCP);
-  procedure(kind_.counterpartProcedure);
+  procedure(counterpartProcedure());
   if (!importer("DEBUT_LIGNE")) return;
   procedure("CREER_ECHEANCE");
   if (!importer("ECHEANCE")) return;
@@ -95,7 +106,7 @@ void PostingProcess::envoyerLignes() {
     if (MIRVAL_TVA.decimal().isZero()) continue;
     lireCompte(MIRVAL_NUMCP);
     if (CDTVA.lit(3, CDTVA_COTVA, '=', MIRVAL_COTVA) != 0) CDTVA.raz();
-    choisirCompteTva();
+    V_NUMCP = vatAccount();
     procedure("CREER_LIGNE_TVA");
     if (!importer("DEBUT_LIGNE")) return;
     if (!importer("FIN_LIGNE")) return;
@@ -133,7 +144,7 @@ void PostingProcess::creer_ligne_ht(Evt*) {
   nouvelleLigne(MOUVE_IMM, MOUVE_IMM_NINST);
   MOUVE_IMM_NUMCP = MIRVAL_NUMCP;
   MOUVE_IMM_LIBEC = MIRVAE_INPIE;
-  poser(MIRVAL_HT.decimal(), kind_.lineSide);
+  poser(MIRVAL_HT.decimal(), lineSide());
   MOUVE_IMM_COTVA = MIRVAL_COTVA;
   MOUVE_IMM_CPOST = MIRVAL_CPOST;
   MOUVE_IMM_CCRIT = MIRVAL_CCRIT;
@@ -144,7 +155,7 @@ void PostingProcess::creer_ligne_tva(Evt*) {
   nouvelleLigne(MOUVE_IMM, MOUVE_IMM_NINST);
   MOUVE_IMM_NUMCP = V_NUMCP;
   MOUVE_IMM_LIBEC = MIRVAE_INPIE;
-  poser(MIRVAL_TVA.decimal(), kind_.lineSide);
+  poser(MIRVAL_TVA.decimal(), lineSide());
   MOUVE_IMM.ecrit();
 }
 
@@ -152,7 +163,7 @@ void PostingProcess::creer_ligne_tiers(Evt*) {
   nouvelleLigne(MOUVE_IMM, MOUVE_IMM_NINST);
   MOUVE_IMM_NUMCP = MIRVAE_NUMCP;
   MOUVE_IMM_LIBEC = MIRVAE_INPIE;
-  poser(MIRVAE_TTC.decimal(), opposite(kind_.lineSide));
+  poser(MIRVAE_TTC.decimal(), opposite(lineSide()));
   MOUVE_IMM.ecrit();
 }
 
@@ -225,19 +236,6 @@ bool PostingProcess::importer(const char* name, Evt* params) {
 
 void PostingProcess::lireCompte(const Donnee& numcp) {
   if (COMPT.lit(3, COMPT_NUMCP, '=', numcp) != 0) COMPT.raz();
-}
-
-void PostingProcess::choisirCompteTva() {
-  switch (kind_.vatRule) {
-    case VatAccountRule::SalesByDueBasis:
-      if (PARAM_PMTVA == "D")
-        V_NUMCP = CDTVA_CITVA;
-      else if (PARAM_PMTVA == "E")
-        V_NUMCP = CDTVA_CETVA;
-      else
-        V_NUMCP = COMPT_TPTVA == "D" ? CDTVA_CITVA : CDTVA_CETVA;
-      break;
-  }
 }
 
 void PostingProcess::nouvelleLigne(Table& table, Champ& ninst) {

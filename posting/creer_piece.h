@@ -16,13 +16,16 @@
 // other failure stops the import. Each failure goes to "TRAITER_ERREUR", which shows
 // the ledger's texts when the code is 10. The process never writes the ledger itself.
 //
-// What differs between the kinds of operation is data (PostingKind); each kind's class
-// keeps its own name and its own branch table.
+// What differs between the kinds of operation is data (their row of the operation-kind
+// table) and a few rules (the side of an amount, the VAT account, the procedure that
+// writes the counterpart), which each kind's class gives; each keeps its own name and
+// its own branch table. A process handed an operation of another kind refuses it.
 #pragma once
 
 #include "host/decimal.h"
 #include "host/table.h"
 #include "model/traitmnt.h"
+#include "registry/operation_kinds.h"
 
 namespace posting {
 
@@ -30,30 +33,10 @@ using namespace host;
 
 enum class Side { Debit, Credit };
 
-// Where the VAT of a line is posted.
-enum class VatAccountRule {
-  // Sales: PARAM.PMTVA "D" takes CDTVA.CITVA, "E" CDTVA.CETVA; otherwise the line
-  // account's TPTVA decides ("D": CITVA, anything else: CETVA).
-  SalesByDueBasis,
-};
-
-// What one kind of operation changes in the posting.
-struct PostingKind {
-  const char* type;                   // MIRVAE.TYPE of the operations it posts
-  Side lineSide;                      // where a positive HT or VAT goes; a negative one goes to the
-                                      // other side, and the counterpart takes the opposite of both
-  VatAccountRule vatRule;
-  const char* counterpartProcedure;   // the procedure that writes the counterpart movement row
-};
-
-// The client invoice: revenue and VAT on credit, the client on debit with a due date.
-inline constexpr PostingKind kClientInvoice{"FC", Side::Credit, VatAccountRule::SalesByDueBasis,
-                                            "CREER_LIGNE_TIERS"};
-
 class PostingProcess : public model::Traitmnt {
  public:
   // `e` carries the IDENT of the operation to post as parameter 0.
-  PostingProcess(Evt* e, const PostingKind& kind);
+  PostingProcess(Evt* e, const registry::OperationKind& kind);
 
   void debut(Evt* e) override;
   void faire(Evt* e) override;
@@ -67,7 +50,17 @@ class PostingProcess : public model::Traitmnt {
   void traiter_erreur(Evt* e);
 
  protected:
-  const PostingKind& kind_;
+  const registry::OperationKind& kind_;
+
+  // The kind's rules, read on the header and the line in the buffers:
+  // where a positive HT or VAT of the line goes (a negative one goes to the other
+  // side, and the counterpart takes the opposite of both);
+  virtual Side lineSide() = 0;
+  // the VAT account of the line, from its VAT code (CDTVA), the dossier (PARAM) and
+  // the line's account (COMPT);
+  virtual Valeur vatAccount() = 0;
+  // the procedure that writes the counterpart movement row.
+  virtual const char* counterpartProcedure() const = 0;
 
   // Variables.
   Chaine P_IDENT{"P_IDENT", "", "", 0, this};
@@ -90,6 +83,7 @@ class PostingProcess : public model::Traitmnt {
 
   // Fields.
   Champ MIRVAE_IDENT{this, "IDENT", table(false)};
+  Champ MIRVAE_TYPE{this, "TYPE", table(false)};
   Champ MIRVAE_NPIES{this, "NPIES", table(false)};
   Champ MIRVAE_NUMCP{this, "NUMCP", table(false)};
   Champ MIRVAE_NUMJL{this, "NUMJL", table(false)};
@@ -163,7 +157,6 @@ class PostingProcess : public model::Traitmnt {
   void envoyerAnalytique();
   // Reads an account into COMPT, or clears the buffer when there is none.
   void lireCompte(const Donnee& numcp);
-  void choisirCompteTva();
   // Starts a transfer row: reset for a new row, blank buffer, instance number.
   void nouvelleLigne(Table& table, Champ& ninst);
   // Removes this import's rows from a transfer table.

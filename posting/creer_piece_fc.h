@@ -7,4 +7,12 @@ class MIRVAECreer_piece_fc : public posting::PostingProcess {
  public:
   // `e` carries the IDENT of the operation to post.
   explicit MIRVAECreer_piece_fc(host::Evt* e);
+
+ protected:
+  // Revenue and VAT on credit, the client on debit.
+  posting::Side lineSide() override { return posting::Side::Credit; }
+  // Sales VAT: PARAM.PMTVA "D" takes CDTVA.CITVA, "E" CDTVA.CETVA; otherwise the line
+  // account's TPTVA decides ("D": CITVA, anything else: CETVA).
+  host::Valeur vatAccount() override;
+  const char* counterpartProcedure() const override { return "CREER_LIGNE_TIERS"; }
 };

@@ -217,9 +217,19 @@ TEST_F(CreerPieceFcTest, ErrorTextsShownOneBoxEachForCodeTenOnly) {
   EXPECT_EQ(appels_.back(), "FIN_PIECE");
 }
 
-TEST_F(CreerPieceFcTest, MissingHeaderOrParametersPostNothing) {
+TEST_F(CreerPieceFcTest, MissingHeaderOrParametersOrAnotherKindPostNothing) {
   poster("INCONNU");
   EXPECT_TRUE(appels_.empty());
+  // A supplier invoice handed to the client-invoice posting would post reversed.
+  ecrire({.ident = "OP000009", .lignes = {{"601000", "100"}}, .numcp = "401001", .numjl = "AC"});
+  base().exec("UPDATE MIRVAE SET TYPE = 'FF' WHERE IDENT = 'OP000009'");
+  poster("OP000009");
+  EXPECT_TRUE(appels_.empty());
+  EXPECT_EQ(npies("OP000009"), "");
+  ASSERT_FALSE(messages().empty());
+  EXPECT_EQ(messages().back(),
+            "L'opération OP000009 est de type « FF » : elle ne peut être comptabilisée comme une opération de type "
+            "« FC ».");
   ecrire({.lignes = {{"706000", "100"}}});
   base().exec("DELETE FROM PARAM");
   poster();

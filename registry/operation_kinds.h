@@ -1,12 +1,16 @@
-// What differs between the six entry screens: one row of constants and texts per
-// operation kind (1 client invoice ... 6 miscellaneous operation). The screens share
-// one implementation (entry/gestion.h); everything kind-specific that is data lives
-// here, so a new kind is a new row plus the few handlers it adds or drops.
+// The six kinds of operation (1 client invoice, 2 supplier invoice, 3 staff expense
+// note, 4 bank, 5 cash, 6 miscellaneous operation): one row of constants and texts
+// per kind, read alike by the browsers, the entry screens, the posting processes and
+// the prints. Each of those shares one implementation across the kinds; what differs
+// and is data lives here, and the few rules that are not data are functions of the
+// kind's own class.
 #pragma once
 
 #include <array>
+#include <string>
+#include <string_view>
 
-namespace entry {
+namespace registry {
 
 // Currency proposed to a new operation.
 enum class CreationCurrency {
@@ -27,10 +31,11 @@ enum class CreationDueDate {
   None,
 };
 
-struct EntryKind {
-  int number;                 // the digit that ends the module names
-  const char* type;           // MIRVAE.TYPE written on creation, and the only one shown
-  const char* screen;         // screen description ("+GESTION1")
+struct OperationKind {
+  int number;                 // the digit that ends the module, screen and print names
+  // MIRVAE.TYPE: written on creation, the only one a kind's screens show, and the end
+  // of its posting module's name ("FC" ... "OD").
+  const char* type;
   const char* journalNature;  // JONAL.TYPJL of the journals proposed
   const char* noJournal;      // shown when the dossier has no journal of that nature
   const char* headerNature;   // nature letter of the header account ("" when none)
@@ -45,8 +50,6 @@ struct EntryKind {
   CreationJournal journal;
   CreationCurrency currency;
   CreationDueDate dueDate;
-  const char* postingModule;  // module of library "MIRVAE" run after each save
-  const char* printForm;      // form name given to the print procedure
   bool models;                // entry models offered (MODTE, MODLI)
   // Choices of the validation dialog of a creation; the leading digit is the answer.
   std::array<const char*, 4> choices;  // unused trailing entries are nullptr
@@ -54,10 +57,22 @@ struct EntryKind {
   const char* headerRequired;     // no header account at validation
   const char* headerMissing;      // header account typed that does not exist
   const char* headerUnknownOpen;  // opened record whose account is gone: + number + "> inexistant !"
+  const char* rowUnknownTitle;    // a browser's row whose account is gone: + number + "> inexistant !"
   const char* lineAccountRequired;
+
+  // Names, made from the digit and the type.
+  std::string accessModule() const { return "MIRVAE-ACCES" + std::to_string(number); }  // registry name
+  std::string accessScreen() const { return "+ACCES" + std::to_string(number); }
+  std::string entryModule() const { return "GESTION" + std::to_string(number); }  // in library "MIRVAE"
+  std::string entryScreen() const { return "+GESTION" + std::to_string(number); }
+  std::string postingModule() const { return std::string("CREER_PIECE_") + type; }  // in library "MIRVAE"
+  std::string printForm() const { return "fiche" + std::to_string(number); }
+  std::string printList() const { return "liste" + std::to_string(number); }
 };
 
 // The row of kind `number` (1 to 6); HostError for any other number.
-const EntryKind& entryKind(int number);
+const OperationKind& operationKind(int number);
+// The row whose MIRVAE.TYPE is `type`; HostError for any other text.
+const OperationKind& operationKindOfType(std::string_view type);
 
-}  // namespace entry
+}  // namespace registry

@@ -1,10 +1,10 @@
-#include "entry/kinds.h"
+#include "registry/operation_kinds.h"
 
 #include <string>
 
 #include "host/error.h"
 
-namespace entry {
+namespace registry {
 
 namespace {
 
@@ -20,10 +20,9 @@ constexpr const char* kNoTreasuryJournal =
 // Where a kind decides per operation (the expense note by its type of counterparty,
 // bank and cash by their direction), the row holds the value of a new operation and
 // the kind's own handlers choose the others.
-const EntryKind kKinds[] = {
+const OperationKind kKinds[] = {
     {.number = 1,
      .type = "FC",
-     .screen = "+GESTION1",
      .journalNature = "V",
      .noJournal = "Aucun journal de nature Vente n'a été défini!@Opération impossible.",
      .headerNature = "C",
@@ -36,17 +35,15 @@ const EntryKind kKinds[] = {
      .journal = CreationJournal::FirstOfNature,
      .currency = CreationCurrency::Dossier,
      .dueDate = CreationDueDate::OperationDate,
-     .postingModule = "CREER_PIECE_FC",
-     .printForm = "fiche1",
      .models = true,
      .choices = kChoicesWithPrint,
      .headerRequired = "La saisie d'un client est obligatoire !",
      .headerMissing = "Le compte Client est inexistant !",
      .headerUnknownOpen = "Compte Client <",
+     .rowUnknownTitle = "Client <",
      .lineAccountRequired = "La saisie d'un compte produit est obligatoire !"},
     {.number = 2,
      .type = "FF",
-     .screen = "+GESTION2",
      .journalNature = "A",
      .noJournal = kNoPurchaseJournal,
      .headerNature = "F",
@@ -59,17 +56,15 @@ const EntryKind kKinds[] = {
      .journal = CreationJournal::FirstOfNature,
      .currency = CreationCurrency::Dossier,
      .dueDate = CreationDueDate::Today,
-     .postingModule = "CREER_PIECE_FF",
-     .printForm = "fiche2",
      .models = true,
      .choices = kChoicesWithPrint,
      .headerRequired = "La saisie d'un fournisseur est obligatoire !",
      .headerMissing = "Le compte Fournisseur est inexistant !",
      .headerUnknownOpen = "Compte Fournisseur <",
+     .rowUnknownTitle = "Fournisseur <",
      .lineAccountRequired = "La saisie d'un compte charge est obligatoire !"},
     {.number = 3,
      .type = "NDF",
-     .screen = "+GESTION3",
      .journalNature = "A",
      .noJournal = kNoPurchaseJournal,
      .headerNature = "A",
@@ -82,17 +77,15 @@ const EntryKind kKinds[] = {
      .journal = CreationJournal::FirstOfNature,
      .currency = CreationCurrency::Dossier,
      .dueDate = CreationDueDate::Today,
-     .postingModule = "CREER_PIECE_NDF",
-     .printForm = "fiche3",
      .models = false,
      .choices = kChoicesWithPrint,
      .headerRequired = "La saisie d'un tiers est obligatoire !",
      .headerMissing = "Le compte Tiers est inexistant !",
      .headerUnknownOpen = "Compte Tiers <",
+     .rowUnknownTitle = "Tiers <",
      .lineAccountRequired = "La saisie d'un compte charge est obligatoire !"},
     {.number = 4,
      .type = "BQ",
-     .screen = "+GESTION4",
      .journalNature = "T",
      .noJournal = kNoTreasuryJournal,
      .headerNature = "B",
@@ -105,17 +98,15 @@ const EntryKind kKinds[] = {
      .journal = CreationJournal::OfFirstTreasury,
      .currency = CreationCurrency::Journal,
      .dueDate = CreationDueDate::None,
-     .postingModule = "CREER_PIECE_BQ",
-     .printForm = "fiche4",
      .models = true,
      .choices = kChoicesWithoutPrint,
      .headerRequired = "La saisie d'une banque est obligatoire !",
      .headerMissing = "Le compte Banque est inexistant !",
      .headerUnknownOpen = "Compte Banque <",
+     .rowUnknownTitle = "Banque <",
      .lineAccountRequired = ""},
     {.number = 5,
      .type = "CA",
-     .screen = "+GESTION5",
      .journalNature = "T",
      .noJournal = kNoTreasuryJournal,
      .headerNature = "I",
@@ -128,17 +119,15 @@ const EntryKind kKinds[] = {
      .journal = CreationJournal::OfFirstTreasury,
      .currency = CreationCurrency::Journal,
      .dueDate = CreationDueDate::None,
-     .postingModule = "CREER_PIECE_CA",
-     .printForm = "fiche5",
      .models = true,
      .choices = kChoicesWithoutPrint,
      .headerRequired = "La saisie d'une caisse est obligatoire !",
      .headerMissing = "Le compte Caisse est inexistant !",
      .headerUnknownOpen = "Compte Caisse <",
+     .rowUnknownTitle = "Caisse <",
      .lineAccountRequired = ""},
     {.number = 6,
      .type = "OD",
-     .screen = "+GESTION6",
      .journalNature = "O",
      .noJournal = "Aucun journal de nature OD n'a été défini!@Opération impossible.",
      .headerNature = "",
@@ -151,22 +140,27 @@ const EntryKind kKinds[] = {
      .journal = CreationJournal::FirstOfNature,
      .currency = CreationCurrency::Journal,
      .dueDate = CreationDueDate::None,
-     .postingModule = "CREER_PIECE_OD",
-     .printForm = "fiche6",
      .models = true,
      .choices = kChoicesWithoutPrint,
      .headerRequired = "",
      .headerMissing = "",
      .headerUnknownOpen = "",
+     .rowUnknownTitle = "",
      .lineAccountRequired = ""},
 };
 
 }  // namespace
 
-const EntryKind& entryKind(int number) {
-  for (const EntryKind& kind : kKinds)
+const OperationKind& operationKind(int number) {
+  for (const OperationKind& kind : kKinds)
     if (kind.number == number) return kind;
   throw host::HostError("type d'opération « " + std::to_string(number) + " » inconnu (1 à 6 attendu)");
 }
 
-}  // namespace entry
+const OperationKind& operationKindOfType(std::string_view type) {
+  for (const OperationKind& kind : kKinds)
+    if (kind.type == type) return kind;
+  throw host::HostError("type d'opération « " + std::string(type) + " » inconnu (FC, FF, NDF, BQ, CA ou OD attendu)");
+}
+
+}  // namespace registry
