@@ -98,6 +98,11 @@ void Statement::reset() {
 
 int Statement::columnCount() const { return sqlite3_column_count(stmt_); }
 
+std::string Statement::columnName(int column) const {
+  const char* name = sqlite3_column_name(stmt_, column);
+  return name ? name : "";
+}
+
 std::string Statement::text(int column) const {
   const unsigned char* p = sqlite3_column_text(stmt_, column);
   return p ? std::string(reinterpret_cast<const char*>(p), static_cast<std::size_t>(sqlite3_column_bytes(stmt_, column)))

@@ -40,6 +40,7 @@ class Statement {
   bool step();
   void reset();
   int columnCount() const;
+  std::string columnName(int column) const;
   std::string text(int column) const;
   long long integer(int column) const;
   double real(int column) const;

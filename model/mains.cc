@@ -6,6 +6,7 @@
 #include "host/error.h"
 #include "host/registry.h"
 #include "host/table.h"
+#include "host/text.h"
 #include "model/acces.h"
 #include "model/sdocum.h"
 #include "model/step.h"
@@ -34,6 +35,7 @@ struct Target {
       table->affecter(column, v);
   }
   void writeText(const std::string& text, const std::string& object) const {
+    host::text::requireValid(text, object);
     if (variable) {
       variable->affecterTexte(text);
       return;

@@ -161,6 +161,19 @@ TEST_F(ScriptPlayerTest, AFailingExpectationStopsTheScriptAtItsLine) {
   EXPECT_NE(sql("SELECT count(*) FROM COMPT"), "0");
 }
 
+TEST_F(ScriptPlayerTest, ATypedTextThatIsNotCleanUtf8IsRefusedAndTheValueKept) {
+  const std::pair<const char*, const char*> cases[] = {
+      {"Ana\rLopès", "caractère de contrôle U+000D en position 4"},
+      {"Ana L\xF3pez", "octet 0xF3 hors UTF-8 en position 6"},
+  };
+  for (const auto& [typed, why] : cases) {
+    int rc = jouer("open ESSAI-SCRIPT\ntype VNOM Ana\ntype VNOM \"" + std::string(typed) +
+                   "\"\nexpect refused VNOM\nexpect message \"texte refusé pour VNOM : " + why +
+                   "\"\nexpect value VNOM Ana\ntype VNOM \"Zoë 🍺\"\nexpect accepted\n");
+    EXPECT_EQ(rc, 0) << out_;
+  }
+}
+
 TEST_F(ScriptPlayerTest, ExpectationsOnTheLastActionNeedOne) {
   EXPECT_EQ(jouer("open ESSAI-SCRIPT\npress ECHOUER\nexpect accepted\n"), 1);
   EXPECT_NE(out_.find("essai.txt:3: expect accepted : la dernière action a été refusée : « "), std::string::npos)
