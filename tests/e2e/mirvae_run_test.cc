@@ -152,6 +152,22 @@ TEST_F(MirvaeRunTest, TheDemoMakesItsDossierAndNeverReplacesAnotherFile) {
   EXPECT_EQ(text, "mes notes");
 }
 
+TEST_F(MirvaeRunTest, AnInitKilledHalfWayLeavesNothingInTheWayOfTheNext) {
+  other_ = testing_support::cheminTemporaire("mirvae-init");
+  // The system kills a process that writes past its file size limit: here, half-way
+  // through the dossier.
+  Outcome killed = run("ulimit -f 16; '" + std::string(MIRVAE_BINARY) + "' init --demo " + quote(other_));
+  EXPECT_NE(killed.status, 0) << killed.out;
+  EXPECT_FALSE(std::filesystem::exists(other_));
+  Outcome again = mirvae("init --demo " + quote(other_));
+  EXPECT_EQ(again.status, 0) << again.out;
+  EXPECT_EQ(mirvae("ledger " + quote(other_)).out, "Grand livre vide.\n");
+  // What the killed one was building stays beside, under a name of its own.
+  auto folder = std::filesystem::path(other_).parent_path();
+  for (const auto& entry : std::filesystem::directory_iterator(folder))
+    if (entry.path().string().rfind(other_ + ".", 0) == 0) std::filesystem::remove(entry.path());
+}
+
 TEST_F(MirvaeRunTest, ListingAndExportWriteTheLedgerAsStoredOrNameTheValueTheyCannotRead) {
   // One piece, its first label longer than the listing's column, with accents where
   // the column is cut.
