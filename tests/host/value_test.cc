@@ -102,6 +102,16 @@ TEST(Donnee, WritingConvertsToTheKindOrRefuses) {
   m = "12,5";
   EXPECT_EQ(m.chaine(), "12.50");
   EXPECT_TRUE(m < 13);
+  // A number its kind cannot hold is refused as it is written, never kept to fail later.
+  Double d("D", "", "", 0, nullptr);
+  Simple f("F", "", "", 0, nullptr);
+  EXPECT_THROW(n = "9223372036854775808", HostError);
+  EXPECT_THROW(d = "1" + std::string(309, '0'), HostError);
+  EXPECT_THROW(f = "1" + std::string(39, '0'), HostError);
+  // Far below one, a double still shows itself.
+  d = "0." + std::string(320, '0') + "5";
+  EXPECT_GT(d.reel(), 0);
+  EXPECT_EQ(d.chaine().substr(0, 12), "0.0000000000");
 }
 
 TEST(Donnee, BoundVariableReadsAndWritesItsTarget) {
