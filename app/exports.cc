@@ -5,6 +5,9 @@
 
 #include "host/currency.h"
 #include "host/decimal.h"
+#include "host/error.h"
+#include "host/text.h"
+#include "host/value.h"
 
 namespace app {
 
@@ -13,11 +16,59 @@ using host::Statement;
 
 namespace {
 
-Decimal amount(const std::string& text) { return text.empty() ? Decimal() : *Decimal::parse(text); }
+// The row a statement stands on, read as the exports need it. Its first column is
+// the row's key: a value that cannot be written out faithfully (an amount that is
+// not one, a date that is not a day, a text that is not clean UTF-8) is reported by
+// table, row and column, so that a person can find it and put it right.
+class StoredRow {
+ public:
+  StoredRow(const char* table, Statement& s) : table_(table), s_(s) {}
+
+  std::string text(int column) const {
+    std::string value = s_.text(column);
+    if (auto why = host::text::flaw(value)) malformed(column, *why);
+    return value;
+  }
+  Decimal amount(int column) const {
+    std::string value = text(column);
+    if (value.empty()) return Decimal();
+    auto parsed = Decimal::parse(value);
+    if (!parsed) malformed(column, "« " + value + " » n'est pas un montant");
+    return *parsed;
+  }
+  // A stored day, in its stored form (YYYY-MM-DD).
+  std::string day(int column) const {
+    std::string value = text(column);
+    auto parsed = host::lireJour(value);
+    if (!parsed || !*parsed || host::jourIso(*parsed) != value)
+      malformed(column, "« " + value + " » n'est pas une date AAAA-MM-JJ");
+    return value;
+  }
+
+ private:
+  [[noreturn]] void malformed(int column, const std::string& why) const {
+    std::string key = s_.text(0);
+    if (host::text::flaw(key)) key = "?";
+    throw host::HostError("valeur illisible dans le grand livre : table " + std::string(table_) + ", ligne " +
+                          s_.columnName(0) + " = " + key + ", colonne " + s_.columnName(column) + " : " + why);
+  }
+
+  const char* table_;
+  Statement& s_;
+};
+
+// `text` cut to `keep` characters, then padded with blanks to `width` characters:
+// a column of a listing counts what a person sees, not bytes.
+std::string column(const std::string& text, std::size_t width, std::size_t keep) {
+  std::string out = host::text::substring(text, 1, static_cast<long>(keep));
+  std::size_t shown = host::text::length(out);
+  if (shown < width) out.append(width - shown, ' ');
+  return out;
+}
 
 std::string keepingCurrency(host::Database& db) {
-  Statement& s = db.prepare("SELECT MONNAIE_IDENT FROM PARAM WHERE PNUME = 1");
-  std::string currency = s.step() ? s.text(0) : "";
+  Statement& s = db.prepare("SELECT PNUME, MONNAIE_IDENT FROM PARAM WHERE PNUME = 1");
+  std::string currency = s.step() ? StoredRow("PARAM", s).text(1) : "";
   s.reset();
   return currency.empty() ? "EUR" : currency;
 }
@@ -32,15 +83,17 @@ int keepingDecimals(host::Database& db, const std::string& currency) {
 }
 
 struct Piece {
-  std::string npies, npiec, numjl, dtope, label, currency;
+  std::string npies, npiec, numjl, dtope, label;
 };
 
 std::vector<Piece> pieces(host::Database& db) {
   std::vector<Piece> out;
-  Statement& s = db.prepare(
-      "SELECT NPIES, NPIEC, NUMJL, DTOPE, CASE WHEN LIBPI <> '' THEN LIBPI ELSE INPIE END, MONNAIE_IDENT "
-      "FROM PIECE ORDER BY NPIES");
-  while (s.step()) out.push_back({s.text(0), s.text(1), s.text(2), s.text(3), s.text(4), s.text(5)});
+  Statement& s = db.prepare("SELECT NPIES, NPIEC, NUMJL, DTOPE, LIBPI, INPIE FROM PIECE ORDER BY NPIES");
+  while (s.step()) {
+    StoredRow row("PIECE", s);
+    std::string label = row.text(4);
+    out.push_back({row.text(0), row.text(1), row.text(2), row.day(3), label.empty() ? row.text(5) : label});
+  }
   s.reset();
   return out;
 }
@@ -55,48 +108,56 @@ void imprimerGrandLivre(host::Database& db, std::ostream& out) {
     out << "Grand livre vide.\n";
     return;
   }
+  std::ostringstream listing;
   Decimal totalDebit, totalCredit;
   for (const auto& p : all) {
-    out << "Pièce " << p.npies << "  journal " << p.numjl << "  n° " << p.npiec << "  du " << p.dtope << "  "
-        << p.label << "\n";
-    Statement& m = db.prepare("SELECT NLIGS, NUMCP, LIBEC, MTDEB, MTCRE FROM MOUVE WHERE NPIES = ? ORDER BY NLIGS");
+    listing << "Pièce " << p.npies << "  journal " << p.numjl << "  n° " << p.npiec << "  du " << p.dtope << "  "
+            << p.label << "\n";
+    Statement& m =
+        db.prepare("SELECT UNIQ, NLIGS, NUMCP, LIBEC, MTDEB, MTCRE FROM MOUVE WHERE NPIES = ? ORDER BY NLIGS");
     m.bind(1, p.npies);
     while (m.step()) {
-      Decimal debit = amount(m.text(3)), credit = amount(m.text(4));
+      StoredRow row("MOUVE", m);
+      Decimal debit = row.amount(4), credit = row.amount(5);
       totalDebit += debit;
       totalCredit += credit;
-      out << "    " << std::left << std::setw(16) << m.text(0) << std::setw(10) << m.text(1) << std::setw(36)
-          << m.text(2).substr(0, 34) << std::right << std::setw(14)
-          << (debit.isZero() ? "" : host::amountText(debit, decimals)) << std::setw(14)
-          << (credit.isZero() ? "" : host::amountText(credit, decimals)) << "\n";
+      listing << "    " << column(row.text(1), 16, 16) << column(row.text(2), 10, 10) << column(row.text(3), 36, 34)
+              << std::right << std::setw(14) << (debit.isZero() ? "" : host::amountText(debit, decimals))
+              << std::setw(14) << (credit.isZero() ? "" : host::amountText(credit, decimals)) << "\n";
     }
     m.reset();
-    Statement& e = db.prepare("SELECT DTECH, MTECH FROM ECHEA WHERE NPIES = ? ORDER BY NUSYS");
+    Statement& e = db.prepare("SELECT NUSYS, DTECH, MTECH FROM ECHEA WHERE NPIES = ? ORDER BY NUSYS");
     e.bind(1, p.npies);
-    while (e.step())
-      out << "    échéance du " << e.text(0) << " : " << host::amountText(amount(e.text(1)), decimals) << "\n";
+    while (e.step()) {
+      StoredRow row("ECHEA", e);
+      listing << "    échéance du " << row.day(1) << " : " << host::amountText(row.amount(2), decimals) << "\n";
+    }
     e.reset();
   }
-  out << "Total des mouvements : débit " << host::amountText(totalDebit, decimals) << " " << currency
-      << ", crédit " << host::amountText(totalCredit, decimals) << " " << currency << "\n";
+  listing << "Total des mouvements : débit " << host::amountText(totalDebit, decimals) << " " << currency
+          << ", crédit " << host::amountText(totalCredit, decimals) << " " << currency << "\n";
+  out << listing.str();
 }
 
 void exporterHledger(host::Database& db, std::ostream& out) {
   std::string currency = keepingCurrency(db);
   const int decimals = keepingDecimals(db, currency);
-  out << "; ledger of the dossier, amounts in " << currency << "\n\n";
+  std::ostringstream journal;
+  journal << "; ledger of the dossier, amounts in " << currency << "\n\n";
   for (const auto& p : pieces(db)) {
-    out << p.dtope << " (" << (p.npiec.empty() ? p.npies : p.npiec) << ") " << p.label << "\n";
-    out << "    ; piece: " << p.npies << ", journal: " << p.numjl << "\n";
-    Statement& m = db.prepare("SELECT NUMCP, MTDEB, MTCRE FROM MOUVE WHERE NPIES = ? ORDER BY NLIGS");
+    journal << p.dtope << " (" << (p.npiec.empty() ? p.npies : p.npiec) << ") " << p.label << "\n";
+    journal << "    ; piece: " << p.npies << ", journal: " << p.numjl << "\n";
+    Statement& m = db.prepare("SELECT UNIQ, NUMCP, MTDEB, MTCRE FROM MOUVE WHERE NPIES = ? ORDER BY NLIGS");
     m.bind(1, p.npies);
     while (m.step()) {
-      Decimal value = amount(m.text(1)) - amount(m.text(2));
-      out << "    " << m.text(0) << "    " << host::amountText(value, decimals) << " " << currency << "\n";
+      StoredRow row("MOUVE", m);
+      Decimal value = row.amount(2) - row.amount(3);
+      journal << "    " << row.text(1) << "    " << host::amountText(value, decimals) << " " << currency << "\n";
     }
     m.reset();
-    out << "\n";
+    journal << "\n";
   }
+  out << journal.str();
 }
 
 }  // namespace app

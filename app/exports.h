@@ -7,6 +7,10 @@
 
 namespace app {
 
+// Both write the ledger whole or not at all: a stored value that cannot be written
+// out as it is (an amount or a date that is not one, a text that is not clean UTF-8)
+// is a HostError naming its table, row and column, and nothing is written to `out`.
+
 // Pieces in number order, each with its movements and due dates, in columns.
 void imprimerGrandLivre(host::Database& db, std::ostream& out);
 

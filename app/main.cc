@@ -4,6 +4,7 @@
 
 #include <fstream>
 #include <iostream>
+#include <sstream>
 
 #include "app/exports.h"
 #include "app/script.h"
@@ -63,11 +64,14 @@ int main(int argc, char** argv) {
     }
     if (exportCommand->parsed()) {
       auto db = registry::ouvrirDossier(dossier);
+      // Made whole before the file is opened: a failed export leaves a file as it was.
+      std::ostringstream journal;
+      app::exporterHledger(*db, journal);
       if (output.empty()) {
-        app::exporterHledger(*db, std::cout);
+        std::cout << journal.str();
       } else {
         std::ofstream file(output);
-        app::exporterHledger(*db, file);
+        file << journal.str();
         if (!file) throw host::HostError("écriture impossible dans « " + output + " »");
       }
       return 0;

@@ -60,8 +60,8 @@ int demo(const std::string& path, std::ostream& out) {
   if (std::filesystem::exists(path)) {
     try {
       registry::ouvrirDossier(path);
-    } catch (const host::HostError&) {
-      throw host::HostError("« " + path + " » existe et n'est pas un dossier : il n'est pas remplacé");
+    } catch (const host::HostError& error) {
+      throw host::HostError("« " + path + " » existe et n'est pas remplacé : " + error.what());
     }
     for (const char* suffix : {"", "-wal", "-shm"}) std::filesystem::remove(path + suffix);
   }

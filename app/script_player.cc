@@ -279,23 +279,58 @@ void ScriptPlayer::expect(const Instruction& line) {
   }
 }
 
-// A query of the script reads the dossier through the session's own connection
-// (so it sees what the session has written, work tables included) but may never
-// change it: only one statement, and only one that reads.
+namespace {
+
+// Lets a statement read tables and call functions, nothing else: no write, no
+// transaction or savepoint, no ATTACH, no pragma. `denied` is set when it refused.
+int onlyReads(void* denied, int action, const char*, const char*, const char*, const char*) {
+  switch (action) {
+    case SQLITE_SELECT:
+    case SQLITE_READ:
+    case SQLITE_FUNCTION:
+    case SQLITE_RECURSIVE:
+      return SQLITE_OK;
+    default:
+      *static_cast<bool*>(denied) = true;
+      return SQLITE_DENY;
+  }
+}
+
+}  // namespace
+
+// A query of the script reads the dossier as another process would see it, on a
+// connection of its own, opened read-only for this query and closed after it: no
+// statement can change the dossier, nor leave the session's connection in a state
+// (a transaction, a lock, an attached file, a pragma) that its next action would
+// meet. It sees what the actions played so far committed, not the session's work
+// tables. Only one statement, and only one that reads.
 void ScriptPlayer::expectSql(const Instruction& line) {
   const std::string& query = line.args[0];
-  sqlite3* db = session_->base().brut();
+  const char* readOnly = "une requête de script ne fait que lire le dossier";
+  sqlite3* connection = nullptr;
+  int opened = sqlite3_open_v2(session_->dossier().c_str(), &connection, SQLITE_OPEN_READONLY, nullptr);
+  std::unique_ptr<sqlite3, int (*)(sqlite3*)> db(connection, sqlite3_close);
+  if (opened != SQLITE_OK)
+    failLine(line, std::string("lecture du dossier impossible : ") + (db ? sqlite3_errmsg(db.get()) : "mémoire"));
+  sqlite3_busy_timeout(db.get(), 10000);
+  sqlite3_exec(db.get(), "PRAGMA query_only = ON", nullptr, nullptr, nullptr);
+  bool denied = false;
+  sqlite3_set_authorizer(db.get(), onlyReads, &denied);
+
   sqlite3_stmt* raw = nullptr;
   const char* tail = nullptr;
-  if (sqlite3_prepare_v2(db, query.c_str(), static_cast<int>(query.size()), &raw, &tail) != SQLITE_OK)
-    failLine(line, std::string("requête refusée par la base : ") + sqlite3_errmsg(db));
+  int prepared = sqlite3_prepare_v2(db.get(), query.c_str(), static_cast<int>(query.size()), &raw, &tail);
   std::unique_ptr<sqlite3_stmt, int (*)(sqlite3_stmt*)> statement(raw, sqlite3_finalize);
+  if (denied) failLine(line, readOnly);
+  if (prepared != SQLITE_OK)
+    failLine(line, std::string("requête refusée par la base : ") + sqlite3_errmsg(db.get()));
   if (!statement) failLine(line, "requête vide");
   for (; tail && *tail; ++tail)
     if (!std::isspace(static_cast<unsigned char>(*tail)) && *tail != ';') failLine(line, "une seule requête par ligne");
-  if (!sqlite3_stmt_readonly(statement.get())) failLine(line, "une requête de script ne fait que lire le dossier");
+  if (!sqlite3_stmt_readonly(statement.get())) failLine(line, readOnly);
   int rc = sqlite3_step(statement.get());
-  if (rc != SQLITE_ROW && rc != SQLITE_DONE) failLine(line, std::string("requête en échec : ") + sqlite3_errmsg(db));
+  if (rc != SQLITE_ROW && rc != SQLITE_DONE)
+    failLine(line, std::string("requête en échec : ") + sqlite3_errmsg(db.get()));
   // No row, or a null, reads as the empty text.
   std::string got;
   if (rc == SQLITE_ROW && sqlite3_column_type(statement.get(), 0) != SQLITE_NULL)

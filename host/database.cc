@@ -2,8 +2,10 @@
 
 #include <sqlite3.h>
 
+#include <cerrno>
 #include <cstdint>
 #include <cstdlib>
+#include <cstring>
 #include <filesystem>
 
 #include "host/error.h"
@@ -30,6 +32,9 @@ std::string quoteText(std::string_view text) {
 
 namespace {
 
+// How long a unit of work waits for another process's unit to end.
+constexpr int kBusySeconds = 10;
+
 [[noreturn]] void fail(sqlite3* db, std::string_view what) {
   throw HostError(std::string(what) + " : " + (db ? sqlite3_errmsg(db) : "base inaccessible"));
 }
@@ -50,7 +55,8 @@ void failIfBusy(sqlite3* db, int rc) {
   // once rather than risk two units waiting on each other), nor write once another
   // process has written since it began: it starts again from a fresh reading.
   if (!sqlite3_get_autocommit(db) && sqlite3_txn_state(db, "main") != SQLITE_TXN_WRITE) throw UniteARecommencer{};
-  throw HostError("le dossier est occupé par un autre utilisateur depuis plus de dix secondes ; "
+  throw HostError("le dossier est occupé par un autre utilisateur depuis plus de " + std::to_string(kBusySeconds) +
+                  " secondes ; "
                   "rien n'est enregistré, réessayez dans un instant");
 }
 
@@ -58,14 +64,59 @@ void rowHashFunction(sqlite3_context* context, int count, sqlite3_value** values
   sqlite3_result_int64(context, empreinteLigne(values, count));
 }
 
+// Words for the system errors a person can act on; nothing for the others.
+std::optional<std::string> knownSystemReason(int error) {
+  switch (error) {
+    case ENOSPC:
+    case EDQUOT: return "le disque est plein";
+    case EROFS: return "le fichier ou son système de fichiers est en lecture seule";
+    case EACCES:
+    case EPERM: return "les droits du fichier ou de son répertoire ne le permettent pas";
+    default: return std::nullopt;
+  }
+}
+
+// Why a dossier's file cannot be used: a lock from SQLite's extended result code, a
+// failure of the file from the system's error number when SQLite kept one (or from the
+// code when it did not); nothing when neither says more than SQLite's own message.
+std::optional<std::string> reasonOf(int code, int systemError) {
+  switch (code & 0xFF) {
+    case SQLITE_BUSY:
+    case SQLITE_LOCKED:
+      return "il est verrouillé par un autre programme, qui ne l'a pas libéré en " + std::to_string(kBusySeconds) +
+             " secondes";
+    case SQLITE_FULL: return knownSystemReason(ENOSPC);
+    default: break;
+  }
+  if (auto known = knownSystemReason(systemError)) return known;
+  if ((code & 0xFF) == SQLITE_READONLY) return knownSystemReason(EROFS);
+  return std::nullopt;
+}
+
+// SQLite's message for the failure just met, unless the disk is full: that one is
+// said in words a person can act on.
+std::string failureText(sqlite3* db, const char* message) {
+  int code = sqlite3_extended_errcode(db) & 0xFF;
+  if (code == SQLITE_FULL || (code == SQLITE_IOERR && sqlite3_system_errno(db) == ENOSPC))
+    return *knownSystemReason(ENOSPC);
+  return message ? message : sqlite3_errmsg(db);
+}
+
+[[noreturn]] void unusable(const std::string& path, sqlite3* db, int code) {
+  if ((code & 0xFF) == SQLITE_NOTADB) throw HostError("« " + path + " » n'est pas un dossier");
+  std::string reason = reasonOf(code, db ? sqlite3_system_errno(db) : 0)
+                           .value_or(db ? sqlite3_errmsg(db) : "échec d'ouverture");
+  throw HostError("le dossier « " + path + " » ne peut être ouvert : " + reason);
+}
+
 sqlite3* openFile(const std::string& path, int flags) {
   sqlite3* db = nullptr;
-  if (sqlite3_open_v2(path.c_str(), &db, flags, nullptr) != SQLITE_OK) {
-    std::string message = db ? sqlite3_errmsg(db) : "échec d'ouverture";
-    sqlite3_close(db);
-    throw HostError("dossier « " + path + " » : " + message);
+  int rc = sqlite3_open_v2(path.c_str(), &db, flags, nullptr);
+  if (rc != SQLITE_OK) {
+    std::unique_ptr<sqlite3, int (*)(sqlite3*)> closing(db, sqlite3_close);
+    unusable(path, db, db ? sqlite3_extended_errcode(db) : rc);
   }
-  sqlite3_busy_timeout(db, 10000);
+  sqlite3_busy_timeout(db, kBusySeconds * 1000);
   sqlite3_extended_result_codes(db, 1);
   sqlite3_create_function(db, "empreinte_ligne", -1, SQLITE_UTF8 | SQLITE_DETERMINISTIC, nullptr, rowHashFunction,
                           nullptr, nullptr);
@@ -113,6 +164,8 @@ long long empreinteLigne(sqlite3_value** values, int count) {
   }
   return static_cast<long long>(hash);
 }
+
+std::string systemReason(int error) { return knownSystemReason(error).value_or(std::strerror(error)); }
 
 // ---------------------------------------------------------------------------- Statement
 
@@ -162,7 +215,7 @@ bool Statement::step() {
   int rc = sqlite3_step(stmt_);
   if (rc == SQLITE_ROW) return true;
   if (rc == SQLITE_DONE) return false;
-  std::string message = sqlite3_errmsg(db_);
+  std::string message = failureText(db_, nullptr);
   sqlite3_reset(stmt_);
   failIfBusy(db_, rc);
   throw HostError("base de données : " + message);
@@ -174,6 +227,11 @@ void Statement::reset() {
 }
 
 int Statement::columnCount() const { return sqlite3_column_count(stmt_); }
+
+std::string Statement::columnName(int column) const {
+  const char* name = sqlite3_column_name(stmt_, column);
+  return name ? name : "";
+}
 
 std::string Statement::text(int column) const {
   const unsigned char* p = sqlite3_column_text(stmt_, column);
@@ -202,20 +260,33 @@ std::unique_ptr<Database> Database::creer(const std::string& path) {
 
 std::unique_ptr<Database> Database::ouvrir(const std::string& path) {
   if (!std::filesystem::exists(path)) throw HostError("dossier « " + path + " » introuvable");
+  if (!std::filesystem::is_regular_file(path)) throw HostError("« " + path + " » n'est pas un dossier");
   sqlite3* db = openFile(path, SQLITE_OPEN_READWRITE);
   auto result = std::unique_ptr<Database>(new Database(db, path));
+  // SQLite opens a file it may not write read-only, without a word: every action
+  // would then fail at its first write.
+  if (sqlite3_db_readonly(db, "main") == 1) unusable(path, db, SQLITE_READONLY);
+  // The first read of the file tells a locked, unreadable or foreign file apart.
+  sqlite3_stmt* raw = nullptr;
+  int rc = sqlite3_prepare_v2(db, "SELECT VALEUR FROM DOSSIER_INFO WHERE CLE = 'schema_version'", -1, &raw, nullptr);
+  std::unique_ptr<sqlite3_stmt, int (*)(sqlite3_stmt*)> query(raw, sqlite3_finalize);
+  if (rc == SQLITE_OK) rc = sqlite3_step(raw);
   std::string version;
-  try {
-    Statement& s = result->prepare("SELECT VALEUR FROM DOSSIER_INFO WHERE CLE = 'schema_version'");
-    if (s.step()) version = s.text(0);
-    s.reset();
-  } catch (const HostError&) {
-    throw HostError("« " + path + " » n'est pas un dossier");
+  if (rc == SQLITE_ROW) {
+    const unsigned char* text = sqlite3_column_text(raw, 0);
+    version = text ? reinterpret_cast<const char*>(text) : "";
+  } else if (rc != SQLITE_DONE) {
+    int code = sqlite3_extended_errcode(db);
+    // A database of another program: readable, but without the dossier's own table.
+    if (code == SQLITE_ERROR) throw HostError("« " + path + " » n'est pas un dossier");
+    unusable(path, db, code);
   }
+  query.reset();
   if (version != kSchemaVersion)
     throw HostError("le dossier « " + path + " » est de la version " + (version.empty() ? "?" : version) +
                     " du schéma ; ce programme lit la version " + kSchemaVersion);
-  result->exec("PRAGMA journal_mode = WAL");
+  if (sqlite3_exec(db, "PRAGMA journal_mode = WAL", nullptr, nullptr, nullptr) != SQLITE_OK)
+    unusable(path, db, sqlite3_extended_errcode(db));
   return result;
 }
 
@@ -229,7 +300,7 @@ void Database::exec(std::string_view sql) {
   char* error = nullptr;
   std::string text(sql);
   if (int rc = sqlite3_exec(db_, text.c_str(), nullptr, nullptr, &error); rc != SQLITE_OK) {
-    std::string message = error ? error : "erreur";
+    std::string message = failureText(db_, error ? error : "erreur");
     sqlite3_free(error);
     failIfBusy(db_, rc);
     throw HostError("base de données : " + message);

@@ -52,6 +52,7 @@ class Statement {
   bool step();
   void reset();
   int columnCount() const;
+  std::string columnName(int column) const;
   std::string text(int column) const;
   long long integer(int column) const;
   double real(int column) const;
@@ -68,8 +69,11 @@ class Database {
  public:
   static constexpr const char* kSchemaVersion = "1";
 
-  // Opens an existing dossier; throws HostError when the file is missing, is not a
-  // dossier, or has another schema version. The file is not changed on failure.
+  // Opens an existing dossier for reading and writing. Throws HostError saying what
+  // happened: the file is missing, is not a dossier, has another schema version, is
+  // locked by another process beyond the wait of a unit of work, cannot be written
+  // (read-only file or file system, rights) or the disk is full. The file is not
+  // changed on failure.
   static std::unique_ptr<Database> ouvrir(const std::string& path);
   // Opens or creates a plain database file (used to make a dossier, and in tests).
   static std::unique_ptr<Database> creer(const std::string& path);
@@ -128,6 +132,10 @@ class Database {
   std::map<std::string, std::string> private_copies_;  // name -> dossier table it copies
   std::multimap<std::string, std::string> spare_copies_;  // dossier table -> its empty spare copies
 };
+
+// Words for a system error number met on a dossier's file ("le disque est plein"),
+// as the messages of opening and making a dossier say it.
+std::string systemReason(int error);
 
 // "NAME" quoted for SQL.
 std::string quoteIdent(std::string_view name);

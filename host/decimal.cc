@@ -1,6 +1,7 @@
 #include "host/decimal.h"
 
 #include <charconv>
+#include <cmath>
 #include <stdexcept>
 
 namespace host {
@@ -52,18 +53,30 @@ std::optional<Decimal> Decimal::parse(std::string_view text) {
   return Decimal(negative ? Int(-mantissa) : mantissa, scale);
 }
 
-Decimal Decimal::fromDouble(double value) {
-  char buffer[64];
+namespace {
+
+// The shortest text of a binary number, in fixed notation: at most 309 integer
+// digits, or 325 decimals for the smallest double. Infinities and NaN have none.
+template <typename Binary>
+std::optional<Decimal> shortestOf(Binary value) {
+  char buffer[400];
   auto [end, ec] = std::to_chars(buffer, buffer + sizeof buffer, value, std::chars_format::fixed);
-  if (ec != std::errc()) throw std::invalid_argument("nombre hors limites");
-  return *parse(std::string_view(buffer, end - buffer));
+  if (ec != std::errc()) return std::nullopt;
+  return Decimal::parse(std::string_view(buffer, static_cast<std::size_t>(end - buffer)));
+}
+
+}  // namespace
+
+Decimal Decimal::fromDouble(double value) {
+  auto decimal = shortestOf(value);
+  if (!decimal) throw std::invalid_argument("nombre hors limites");
+  return *decimal;
 }
 
 Decimal Decimal::fromFloat(float value) {
-  char buffer[64];
-  auto [end, ec] = std::to_chars(buffer, buffer + sizeof buffer, value, std::chars_format::fixed);
-  if (ec != std::errc()) throw std::invalid_argument("nombre hors limites");
-  return *parse(std::string_view(buffer, end - buffer));
+  auto decimal = shortestOf(value);
+  if (!decimal) throw std::invalid_argument("nombre hors limites");
+  return *decimal;
 }
 
 Decimal Decimal::rounded(int decimals) const {
@@ -100,7 +113,11 @@ std::string Decimal::toFixed(int decimals) const { return rounded(decimals).toSt
 double Decimal::toDouble() const {
   double value = 0;
   std::string text = toString(0);
-  std::from_chars(text.data(), text.data() + text.size(), value);
+  auto [end, ec] = std::from_chars(text.data(), text.data() + text.size(), value);
+  // Beyond a double's range the text reads as nothing: too large is infinite, too
+  // small is zero.
+  if (ec == std::errc::result_out_of_range)
+    return abs() >= Decimal(1) ? (sign() < 0 ? -HUGE_VAL : HUGE_VAL) : 0.0;
   return value;
 }
 

@@ -1,6 +1,9 @@
 #include "host/text.h"
 
 #include <algorithm>
+#include <cstdio>
+
+#include "host/error.h"
 
 namespace host::text {
 namespace {
@@ -18,7 +21,57 @@ std::size_t offsetOf(std::string_view s, std::size_t index) {
   return s.size();
 }
 
+// Length of the UTF-8 sequence that starts `s` at `at`, 0 when the bytes there are
+// not one: a stray continuation byte, an overlong form, a surrogate, a code point
+// beyond U+10FFFF, or a sequence cut short. Sets `code` to its code point.
+std::size_t sequenceAt(std::string_view s, std::size_t at, char32_t& code) {
+  auto byte = [&](std::size_t i) { return static_cast<unsigned char>(s[i]); };
+  unsigned char lead = byte(at);
+  if (lead < 0x80) {
+    code = lead;
+    return 1;
+  }
+  std::size_t size = lead >= 0xC2 && lead <= 0xDF   ? 2
+                     : lead >= 0xE0 && lead <= 0xEF ? 3
+                     : lead >= 0xF0 && lead <= 0xF4 ? 4
+                                                    : 0;
+  if (size == 0 || at + size > s.size()) return 0;
+  code = lead & (0x7F >> size);
+  for (std::size_t i = 1; i < size; ++i) {
+    if (!isContinuation(byte(at + i))) return 0;
+    code = (code << 6) | (byte(at + i) & 0x3F);
+  }
+  static constexpr char32_t kSmallest[] = {0, 0, 0x80, 0x800, 0x10000};
+  if (code < kSmallest[size] || code > 0x10FFFF || (code >= 0xD800 && code <= 0xDFFF)) return 0;
+  return size;
+}
+
+bool isControl(char32_t code) { return code < 0x20 || (code >= 0x7F && code <= 0x9F); }
+
 }  // namespace
+
+std::optional<std::string> flaw(std::string_view s) {
+  std::size_t position = 1;
+  for (std::size_t at = 0; at < s.size(); ++position) {
+    char32_t code = 0;
+    std::size_t size = sequenceAt(s, at, code);
+    char shown[32];
+    if (size == 0) {
+      std::snprintf(shown, sizeof shown, "0x%02X", static_cast<unsigned>(static_cast<unsigned char>(s[at])));
+      return "octet " + std::string(shown) + " hors UTF-8 en position " + std::to_string(position);
+    }
+    if (isControl(code)) {
+      std::snprintf(shown, sizeof shown, "U+%04X", static_cast<unsigned>(code));
+      return "caractère de contrôle " + std::string(shown) + " en position " + std::to_string(position);
+    }
+    at += size;
+  }
+  return std::nullopt;
+}
+
+void requireValid(std::string_view s, std::string_view what) {
+  if (auto why = flaw(s)) throw HostError("texte refusé pour " + std::string(what) + " : " + *why);
+}
 
 std::size_t length(std::string_view s) {
   return std::count_if(s.begin(), s.end(), [](char c) { return !isContinuation(static_cast<unsigned char>(c)); });

@@ -1,6 +1,7 @@
 // UTF-8 text measured in characters, as the screens count them.
 #pragma once
 
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -18,5 +19,13 @@ std::string right(std::string_view s, long count);
 std::string upper(std::string_view s);
 // Leading and trailing blanks removed.
 std::string trim(std::string_view s);
+
+// A text the books can keep is valid UTF-8 without control characters (C0, DEL,
+// C1): a carriage return in a label splits a line of every export, and bytes that
+// are not UTF-8 make the whole file unreadable to other tools. flaw() says why `s`
+// is not one ("caractère de contrôle U+000D en position 5"), nothing when it is.
+std::optional<std::string> flaw(std::string_view s);
+// Throws HostError "texte refusé pour WHAT : ..." when `s` has a flaw.
+void requireValid(std::string_view s, std::string_view what);
 
 }  // namespace host::text

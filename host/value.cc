@@ -1,7 +1,10 @@
 #include "host/value.h"
 
 #include <charconv>
+#include <cmath>
 #include <cstdio>
+#include <limits>
+#include <stdexcept>
 
 #include "host/automate.h"
 #include "host/clock.h"
@@ -140,6 +143,10 @@ namespace {
   if (!what.empty()) message += " (" + std::string(what) + ")";
   throw HostError(message);
 }
+[[noreturn]] void refuseTooLarge(std::string_view text, const char* kind, std::string_view what) {
+  throw HostError("« " + std::string(text) + " » est trop grand pour " + kind +
+                  (what.empty() ? std::string() : " (" + std::string(what) + ")"));
+}
 }  // namespace
 
 Valeur Valeur::depuisTexte(Genre genre, std::string_view text, std::string_view what) {
@@ -155,9 +162,21 @@ Valeur Valeur::depuisTexte(Genre genre, std::string_view text, std::string_view 
   switch (genre) {
     case Genre::Entier:
       if (number->truncated(0) != *number) refuse(text, genre, what);
-      return entier(number->toInteger());
-    case Genre::Double: return reel(number->toDouble());
-    case Genre::Simple: return simple(static_cast<float>(number->toDouble()));
+      try {
+        return entier(number->toInteger());
+      } catch (const std::overflow_error&) {
+        refuseTooLarge(text, "un entier", what);
+      }
+    case Genre::Double:
+    case Genre::Simple: {
+      // A number read into a double or a float that cannot hold it is refused, not
+      // kept as an infinity that no screen can show.
+      double binary = number->toDouble();
+      bool fits = genre == Genre::Double ? std::isfinite(binary)
+                                         : std::abs(binary) <= std::numeric_limits<float>::max();
+      if (!fits) refuseTooLarge(text, "un nombre", what);
+      return genre == Genre::Double ? reel(binary) : simple(static_cast<float>(binary));
+    }
     default: return montant(*number);
   }
 }

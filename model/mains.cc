@@ -8,6 +8,7 @@
 #include "host/error.h"
 #include "host/registry.h"
 #include "host/table.h"
+#include "host/text.h"
 #include "model/acces.h"
 #include "model/sdocum.h"
 #include "model/shown.h"
@@ -44,11 +45,12 @@ struct Target {
   }
 };
 
-// The value a user typed into `target`, as the screen takes it: an amount with the
-// decimals of its currency, anything else read as the object's kind. Throws
-// HostError for a text the object cannot take.
+// The value a user typed into `target`, as the screen takes it: a text that may reach
+// the books only as clean UTF-8, an amount with the decimals of its currency, anything
+// else read as the object's kind. Throws HostError for a text the object cannot take.
 host::Valeur typedValue(Automate& screen, const Target& target, const std::string& text,
                         const std::string& object) {
+  host::text::requireValid(text, object);
   if (target.genre() != host::Genre::Monnaie) return host::Valeur::depuisTexte(target.genre(), text, object);
   return host::Valeur::montant(host::euro().saisi(text, screenCurrency(screen), object));
 }

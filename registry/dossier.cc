@@ -1,5 +1,10 @@
 #include "registry/dossier.h"
 
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstdlib>
 #include <filesystem>
 
 #include "host/error.h"
@@ -20,12 +25,42 @@ void replaceAll(std::string& text, const std::string& token, const std::string& 
     text.replace(at, token.size(), value);
 }
 
+// A file a dossier is made in before it takes its name; removed with its SQLite
+// companions when the making ends, whichever way.
+class BuildingFile {
+ public:
+  explicit BuildingFile(const std::string& target) : path_(target + ".XXXXXX") {
+    int fd = ::mkstemp(path_.data());
+    if (fd < 0)
+      throw host::HostError("le dossier « " + target + " » ne peut être créé : " + host::systemReason(errno));
+    // Made private by mkstemp; a dossier is opened by every user the umask lets in.
+    mode_t mask = ::umask(0);
+    ::umask(mask);
+    ::fchmod(fd, 0666 & ~mask);
+    ::close(fd);
+  }
+  ~BuildingFile() {
+    std::error_code ignored;
+    for (const char* suffix : {"", "-journal", "-wal", "-shm"}) std::filesystem::remove(path_ + suffix, ignored);
+  }
+  BuildingFile(const BuildingFile&) = delete;
+  BuildingFile& operator=(const BuildingFile&) = delete;
+  const std::string& path() const { return path_; }
+
+ private:
+  std::string path_;
+};
+
 }  // namespace
 
 void creerDossier(const std::string& path, bool demo, year_month_day today) {
   if (std::filesystem::exists(path)) throw host::HostError("le fichier « " + path + " » existe déjà");
+  // The dossier is made in a file of its own beside the target and takes the target's
+  // name only once whole: a process killed half-way leaves nothing under that name,
+  // and the next creation there is not in its way.
+  BuildingFile building(path);
   try {
-    auto db = host::Database::creer(path);
+    auto db = host::Database::creer(building.path());
     db->exec("BEGIN");
     db->exec(dictionary_sql);
     db->exec(labels_sql);
@@ -41,12 +76,13 @@ void creerDossier(const std::string& path, bool demo, year_month_day today) {
     }
     db->exec("COMMIT");
     db->exec("PRAGMA journal_mode = WAL");
-  } catch (...) {
-    std::error_code ignored;
-    std::filesystem::remove(path, ignored);
-    std::filesystem::remove(path + "-wal", ignored);
-    std::filesystem::remove(path + "-shm", ignored);
-    throw;
+  } catch (const host::HostError& error) {
+    throw host::HostError("le dossier « " + path + " » ne peut être créé : " + error.what());
+  }
+  // A link, unlike a rename, never replaces a file that appeared at `path` meanwhile.
+  if (::link(building.path().c_str(), path.c_str()) != 0) {
+    if (errno == EEXIST) throw host::HostError("le fichier « " + path + " » existe déjà");
+    throw host::HostError("le dossier « " + path + " » ne peut être créé : " + host::systemReason(errno));
   }
 }
 

@@ -12,8 +12,8 @@ namespace registry {
 
 // Creates a dossier at `path` with the whole dictionary and the label texts; with
 // `demo`, also the demo company, whose exercise is the calendar year of `today`.
-// Refuses (HostError) a path where a file already exists; a dossier that could not
-// be made whole is removed.
+// Refuses (HostError) a path where a file already exists. The dossier is made beside
+// `path` and appears there whole, or not at all, even when the process is killed.
 void creerDossier(const std::string& path, bool demo, std::chrono::year_month_day today);
 
 // Opens an existing dossier (HostError when missing, not a dossier, or of another

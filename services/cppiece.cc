@@ -14,6 +14,7 @@
 #include "host/registry.h"
 #include "host/session.h"
 #include "host/snapshot.h"
+#include "host/text.h"
 #include "host/value.h"
 #include "services/sql.h"
 
@@ -514,6 +515,7 @@ std::vector<std::string> PieceImport::faults(const Piece& piece) {
     }
   }
 
+  if (auto why = host::text::flaw(piece.label)) out.push_back("Le libellé de la pièce est refusé : " + *why + ".");
   if (piece.movements.empty()) out.push_back("La pièce ne contient aucun mouvement.");
   if (piece.movements.size() > kMaxMovements)
     out.push_back("La pièce compte plus de " + std::to_string(kMaxMovements) + " mouvements.");
@@ -526,6 +528,7 @@ std::vector<std::string> PieceImport::faults(const Piece& piece) {
       out.push_back(which + "le compte est absent.");
     else if (!scalar(db(), "SELECT 1 FROM \"COMPT\" WHERE \"NUMCP\" = ?", m.account))
       out.push_back(which + "le compte « " + m.account + " » n'existe pas.");
+    if (auto why = host::text::flaw(m.label)) out.push_back(which + "le libellé est refusé : " + *why + ".");
     debit += m.debit;
     credit += m.credit;
   }

@@ -1,6 +1,7 @@
 // The `mirvae` program itself, run as a person runs it: session scripts through
 // `mirvae run` on a fresh demo dossier, the demo, and --help on every command.
 #include <gtest/gtest.h>
+#include <sqlite3.h>
 #include <sys/wait.h>
 
 #include <cstdio>
@@ -8,6 +9,7 @@
 #include <fstream>
 #include <sstream>
 
+#include "host/text.h"
 #include "tests/support/fixture.h"
 
 namespace {
@@ -32,6 +34,21 @@ Outcome run(const std::string& command_line) {
 Outcome mirvae(const std::string& args) { return run(std::string("'") + MIRVAE_BINARY + "' " + args); }
 
 std::string quote(const std::string& path) { return "'" + path + "'"; }
+
+// Writes into a dossier behind the program's back, as a person with sqlite3 would.
+void writeBehind(const std::string& dossier, const std::string& sql) {
+  sqlite3* db = nullptr;
+  ASSERT_EQ(sqlite3_open(dossier.c_str(), &db), SQLITE_OK);
+  char* error = nullptr;
+  EXPECT_EQ(sqlite3_exec(db, sql.c_str(), nullptr, nullptr, &error), SQLITE_OK) << (error ? error : "");
+  sqlite3_free(error);
+  sqlite3_close(db);
+}
+
+std::string contents(const std::string& path) {
+  std::ifstream in(path);
+  return {std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
+}
 
 class MirvaeRunTest : public ::testing::Test {
  protected:
@@ -133,6 +150,75 @@ TEST_F(MirvaeRunTest, TheDemoMakesItsDossierAndNeverReplacesAnotherFile) {
   std::string text;
   std::getline(kept, text);
   EXPECT_EQ(text, "mes notes");
+}
+
+TEST_F(MirvaeRunTest, AnInitKilledHalfWayLeavesNothingInTheWayOfTheNext) {
+  other_ = testing_support::cheminTemporaire("mirvae-init");
+  // The system kills a process that writes past its file size limit: here, half-way
+  // through the dossier.
+  Outcome killed = run("ulimit -f 16; '" + std::string(MIRVAE_BINARY) + "' init --demo " + quote(other_));
+  EXPECT_NE(killed.status, 0) << killed.out;
+  EXPECT_FALSE(std::filesystem::exists(other_));
+  Outcome again = mirvae("init --demo " + quote(other_));
+  EXPECT_EQ(again.status, 0) << again.out;
+  EXPECT_EQ(mirvae("ledger " + quote(other_)).out, "Grand livre vide.\n");
+  // What the killed one was building stays beside, under a name of its own.
+  auto folder = std::filesystem::path(other_).parent_path();
+  for (const auto& entry : std::filesystem::directory_iterator(folder))
+    if (entry.path().string().rfind(other_ + ".", 0) == 0) std::filesystem::remove(entry.path());
+}
+
+TEST_F(MirvaeRunTest, ListingAndExportWriteTheLedgerAsStoredOrNameTheValueTheyCannotRead) {
+  // One piece, its first label longer than the listing's column, with accents where
+  // the column is cut.
+  const std::string label = "Brasserie Lissandre : dîner d’équipe à Montréal";
+  writeBehind(dossier_,
+              "INSERT INTO PIECE (NPIES, NPIEC, NUMJL, DTOPE, LIBPI) VALUES "
+              "('00000000001', 'VT0001', 'VT', '2024-03-15', 'Facture client n° VT0001');"
+              "INSERT INTO MOUVE (UNIQ, NPIES, NLIGS, NUMCP, LIBEC, MTDEB, MTCRE) VALUES "
+              "(1, '00000000001', '000000000010001', '411001', '" + label + "', '120', '0'), "
+              "(2, '00000000001', '000000000010002', '706000', 'Ventes', '0', '120');");
+  Outcome listing = mirvae("ledger " + quote(dossier_));
+  ASSERT_EQ(listing.status, 0) << listing.out;
+  std::string lines = listing.out;
+  std::erase(lines, '\n');
+  EXPECT_EQ(host::text::flaw(lines), std::nullopt) << listing.out;
+  EXPECT_NE(listing.out.find(host::text::substring(label, 1, 34) + "  "), std::string::npos) << listing.out;
+  EXPECT_NE(listing.out.find("Total des mouvements : débit 120.00 EUR, crédit 120.00 EUR"), std::string::npos);
+
+  struct Case {
+    const char* sql;
+    const char* why;
+    bool exported;  // the value is part of the hledger journal
+  } cases[] = {
+      {"UPDATE MOUVE SET MTDEB = 'abc' WHERE UNIQ = 1",
+       "table MOUVE, ligne UNIQ = 1, colonne MTDEB : « abc » n'est pas un montant", true},
+      {"UPDATE MOUVE SET LIBEC = 'Ventes' || char(13) || 'X' WHERE UNIQ = 2",
+       "table MOUVE, ligne UNIQ = 2, colonne LIBEC : caractère de contrôle U+000D en position 7", false},
+      {"UPDATE PIECE SET LIBPI = CAST(X'46616374C3' AS TEXT)",
+       "table PIECE, ligne NPIES = 00000000001, colonne LIBPI : octet 0xC3 hors UTF-8 en position 5", true},
+      {"UPDATE PIECE SET DTOPE = '15/03/2024'",
+       "table PIECE, ligne NPIES = 00000000001, colonne DTOPE : « 15/03/2024 » n'est pas une date AAAA-MM-JJ", true},
+  };
+  other_ = testing_support::cheminTemporaire("mirvae-malformed");
+  const std::string journal = other_ + ".journal";
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.sql);
+    std::filesystem::copy_file(dossier_, other_, std::filesystem::copy_options::overwrite_existing);
+    writeBehind(other_, c.sql);
+    Outcome listed = mirvae("ledger " + quote(other_));
+    EXPECT_EQ(listed.status, 1) << listed.out;
+    EXPECT_EQ(listed.out, std::string("mirvae : valeur illisible dans le grand livre : ") + c.why + "\n");
+    std::ofstream(journal) << "journal précédent\n";
+    Outcome exported = mirvae("export " + quote(other_) + " -o " + quote(journal));
+    EXPECT_EQ(exported.status, c.exported ? 1 : 0) << exported.out;
+    EXPECT_EQ(exported.out.find(c.why) != std::string::npos, c.exported) << exported.out;
+    // A failed export leaves the file it would have written as it was.
+    if (c.exported) {
+      EXPECT_EQ(contents(journal), "journal précédent\n");
+    }
+  }
+  std::filesystem::remove(journal);
 }
 
 }  // namespace

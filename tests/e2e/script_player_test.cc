@@ -5,6 +5,7 @@
 
 #include <gtest/gtest.h>
 
+#include <filesystem>
 #include <sstream>
 
 #include "app/script.h"
@@ -14,6 +15,7 @@
 #include "host/table.h"
 #include "model/acces.h"
 #include "model/traitecr.h"
+#include "registry/dossier.h"
 #include "tests/support/fixture.h"
 
 namespace {
@@ -159,6 +161,52 @@ TEST_F(ScriptPlayerTest, AFailingExpectationStopsTheScriptAtItsLine) {
   }
   // A script query never changed the dossier.
   EXPECT_NE(sql("SELECT count(*) FROM COMPT"), "0");
+}
+
+TEST_F(ScriptPlayerTest, ATypedTextThatIsNotCleanUtf8IsRefusedAndTheValueKept) {
+  const std::pair<const char*, const char*> cases[] = {
+      {"Ana\rLopès", "caractère de contrôle U+000D en position 4"},
+      {"Ana L\xF3pez", "octet 0xF3 hors UTF-8 en position 6"},
+  };
+  for (const auto& [typed, why] : cases) {
+    int rc = jouer("open ESSAI-SCRIPT\ntype VNOM Ana\ntype VNOM \"" + std::string(typed) +
+                   "\"\nexpect refused VNOM\nexpect message \"texte refusé pour VNOM : " + why +
+                   "\"\nexpect value VNOM Ana\ntype VNOM \"Zoë 🍺\"\nexpect accepted\n");
+    EXPECT_EQ(rc, 0) << out_;
+  }
+}
+
+// Statements that read nothing yet change a connection or the dossier: each is refused,
+// and the session's next action, another connection's write and the journal mode
+// are as they were.
+TEST_F(ScriptPlayerTest, AScriptQueryCannotChangeTheSessionNorTheDossier) {
+  const std::string attached = testing_support::cheminTemporaire("mirvae-attach");
+  const std::vector<std::string> queries = {
+      "BEGIN", "BEGIN IMMEDIATE", "SAVEPOINT s", "ATTACH '" + attached + "' AS autre",
+      "PRAGMA locking_mode = EXCLUSIVE", "PRAGMA synchronous = OFF", "PRAGMA journal_mode = DELETE",
+      "PRAGMA query_only = OFF",
+      // What a query needs is let through.
+      "WITH RECURSIVE n(i) AS (SELECT 1 UNION ALL SELECT i + 1 FROM n WHERE i < 3) "
+      "SELECT count(*) FROM n JOIN COMPT ON NUMCP = '411001' WHERE i = 2"};
+  for (const std::string& query : queries) {
+    SCOPED_TRACE(query);
+    std::istringstream text("open ESSAI-SCRIPT\nexpect sql \"" + query + "\" = 1\n");
+    std::ostringstream out;
+    app::ScriptPlayer player(app::parseScript(text), out);
+    Session played(registry::ouvrirDossier(path_), player, "essai");
+    bool reads = query.rfind("WITH", 0) == 0;
+    try {
+      player.play(played);
+      EXPECT_TRUE(reads) << out.str();
+    } catch (const app::ScriptError& e) {
+      EXPECT_FALSE(reads) << e.what();
+      EXPECT_STREQ(e.what(), "une requête de script ne fait que lire le dossier");
+    }
+    EXPECT_TRUE(played.action([&] { played.base().exec("UPDATE PARAM SET PRE18 = 'X' WHERE PNUME = 1"); }));
+    base().exec("UPDATE PARAM SET PRE18 = 'O' WHERE PNUME = 1");
+    EXPECT_EQ(sql("PRAGMA journal_mode"), "wal");
+    EXPECT_FALSE(std::filesystem::exists(attached));
+  }
 }
 
 TEST_F(ScriptPlayerTest, ExpectationsOnTheLastActionNeedOne) {

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include "host/error.h"
+#include "host/text.h"
 
 namespace host {
 namespace {
@@ -53,6 +54,28 @@ TEST(Chaine, PositionsCountCharactersNotBytes) {
   EXPECT_EQ(c(5, 6) + "/" + c(1, 4), "03/2024");
 }
 
+TEST(Chaine, ATextForTheBooksIsCleanUtf8) {
+  const std::pair<const char*, const char*> cases[] = {
+      {"Brasserie Lissandre, café 🍺 ; n° 12", nullptr},
+      {"Ligne\r\nsuivante", "caractère de contrôle U+000D en position 6"},
+      {"a\tb", "caractère de contrôle U+0009 en position 2"},
+      {"a\x7F", "caractère de contrôle U+007F en position 2"},
+      {"é\xC2\x85", "caractère de contrôle U+0085 en position 2"},          // C1 control
+      {"caf\xC3", "octet 0xC3 hors UTF-8 en position 4"},                     // cut short
+      {"caf\xE9", "octet 0xE9 hors UTF-8 en position 4"},                     // Latin-1
+      {"\xC3\xA9\xA9", "octet 0xA9 hors UTF-8 en position 2"},              // stray continuation
+      {"\xC0\xAF", "octet 0xC0 hors UTF-8 en position 1"},                   // overlong
+      {"\xE0\x80\xAF", "octet 0xE0 hors UTF-8 en position 1"},              // overlong
+      {"\xED\xA0\x80", "octet 0xED hors UTF-8 en position 1"},              // surrogate
+      {"\xF4\x90\x80\x80", "octet 0xF4 hors UTF-8 en position 1"},         // beyond U+10FFFF
+  };
+  for (const auto& [text, why] : cases) {
+    auto found = text::flaw(text);
+    EXPECT_EQ(found.value_or(""), why ? why : "") << text;
+  }
+  EXPECT_EQ(text::flaw(std::string("a\0b", 3)).value_or(""), "caractère de contrôle U+0000 en position 2");
+}
+
 TEST(Monnaie, ExactArithmeticThroughValues) {
   Monnaie a("A", "", "", 0, nullptr), b("B", "", "", 0, nullptr);
   a = "0.1";
@@ -79,6 +102,16 @@ TEST(Donnee, WritingConvertsToTheKindOrRefuses) {
   m = "12,5";
   EXPECT_EQ(m.chaine(), "12.50");
   EXPECT_TRUE(m < 13);
+  // A number its kind cannot hold is refused as it is written, never kept to fail later.
+  Double d("D", "", "", 0, nullptr);
+  Simple f("F", "", "", 0, nullptr);
+  EXPECT_THROW(n = "9223372036854775808", HostError);
+  EXPECT_THROW(d = "1" + std::string(309, '0'), HostError);
+  EXPECT_THROW(f = "1" + std::string(39, '0'), HostError);
+  // Far below one, a double still shows itself.
+  d = "0." + std::string(320, '0') + "5";
+  EXPECT_GT(d.reel(), 0);
+  EXPECT_EQ(d.chaine().substr(0, 12), "0.0000000000");
 }
 
 TEST(Donnee, BoundVariableReadsAndWritesItsTarget) {

@@ -105,6 +105,24 @@ TEST_F(CppieceTest, RefusedPieceLeavesNothingAndHandsOutItsTextsOneByOne) {
   EXPECT_EQ(compte("SELECT count(*) FROM MOUVE_IMM"), 0);
 }
 
+TEST_F(CppieceTest, LabelsThatAreNotCleanUtf8AreRefused) {
+  session().action([&] {
+    ASSERT_EQ(appeler("DEBUT_IMPORT", ninst_), 0);
+    ligne("PIECE_IMM", "NUMJL, DTOPE, INPIE, MONNAIE_IDENT", {"VT", "2024-03-15", "Facture\r\nX", "EUR"});
+    ASSERT_EQ(appeler("DEBUT_PIECE", npies_), 0);
+    ligne("MOUVE_IMM", "NUMCP, LIBEC, MTDEB, MTCRE", {"706000", "Caf\xE9", "0", "100"});
+    EXPECT_EQ(appeler("DEBUT_LIGNE"), 0);
+    EXPECT_EQ(appeler("FIN_LIGNE"), 0);
+    envoyer("411001", "100", "0");
+    EXPECT_EQ(finPiece(), services::kPieceRefused);
+    EXPECT_EQ(textes(services::kPieceRefused),
+              (Strings{"Le libellé de la pièce est refusé : caractère de contrôle U+000D en position 8.",
+                       "Mouvement 1 : le libellé est refusé : octet 0xE9 hors UTF-8 en position 4."}));
+    EXPECT_EQ(appeler("FIN_IMPORT"), 0);
+  });
+  EXPECT_EQ(compte("SELECT count(*) FROM PIECE") + compte("SELECT count(*) FROM MOUVE"), 0);
+}
+
 TEST_F(CppieceTest, PieceNotClosedWholeLeavesNothing) {
   session().action([&] {
     ASSERT_EQ(appeler("DEBUT_IMPORT", ninst_), 0);
