@@ -12,7 +12,6 @@
 #include "host/error.h"
 #include "host/registry.h"
 #include "registry/dossier.h"
-#include "registry/library.h"
 
 int main(int argc, char** argv) {
   CLI::App program{"Opérations simplifiées : saisie, contrôle et comptabilisation des opérations courantes"};
@@ -45,7 +44,7 @@ int main(int argc, char** argv) {
   CLI11_PARSE(program, argc, argv);
 
   try {
-    registry::chargerBibliotheque();
+    app::chargerModules();
     if (init->parsed()) {
       registry::creerDossier(dossier, demo, host::clock::today());
       std::cout << "Dossier créé : " << dossier << (demo ? " (démonstration)" : "") << "\n";

@@ -13,6 +13,7 @@
 #include "host/session.h"
 #include "registry/dossier.h"
 #include "registry/library.h"
+#include "services/services.h"
 
 extern const char* const demo_script;
 
@@ -28,6 +29,11 @@ std::string userName() {
 
 }  // namespace
 
+void chargerModules() {
+  registry::chargerBibliotheque();
+  services::chargerServices();
+}
+
 int jouerFichier(const std::string& dossier, const std::string& script, std::ostream& out) {
   std::ifstream in(script);
   if (!in) throw host::HostError("script « " + script + " » illisible");
@@ -35,7 +41,7 @@ int jouerFichier(const std::string& dossier, const std::string& script, std::ost
 }
 
 int jouer(const std::string& dossier, std::istream& script, const std::string& scriptName, std::ostream& out) {
-  registry::chargerBibliotheque();
+  chargerModules();
   std::vector<Instruction> lines;
   try {
     lines = parseScript(script);
@@ -55,7 +61,7 @@ int jouer(const std::string& dossier, std::istream& script, const std::string& s
 }
 
 int demo(const std::string& path, std::ostream& out) {
-  registry::chargerBibliotheque();
+  chargerModules();
   // Only a dossier is ever replaced: a mistyped path must not cost a person a file.
   if (std::filesystem::exists(path)) {
     try {

@@ -8,6 +8,10 @@
 
 namespace app {
 
+// Loads the library and, beside it, the stand-ins of the modules it calls by name;
+// once per process.
+void chargerModules();
+
 // Plays the script in `script` on the dossier, printing the transcript to `out` as
 // it grows. Returns 0 when every line was understood and every expectation held,
 // 1 otherwise, the failing line named on `out` ("script.txt:12: ..."). Throws

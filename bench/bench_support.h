@@ -28,6 +28,7 @@
 #include "host/session.h"
 #include "registry/dossier.h"
 #include "registry/library.h"
+#include "services/services.h"
 
 namespace bench {
 
@@ -55,6 +56,7 @@ inline std::chrono::year_month_day today() {
 // Loads the library and fixes the clock; once per process.
 inline void prepareProcess() {
   registry::chargerBibliotheque();
+  services::chargerServices();
   host::clock::setToday(today());
   host::clock::setTimeOfDay("10:30:00");
 }

@@ -8,7 +8,6 @@
 #include "posting/supprimer_piece.h"
 #include "posting/verifier_modif_piece.h"
 #include "printing/interface.h"
-#include "services/services.h"
 
 namespace registry {
 
@@ -51,7 +50,6 @@ void chargerBibliotheque() {
   // The crash flag of the access screens' model; the library itself never reads it.
   [[maybe_unused]] static host::Chaine crashFlag("$$|VCODECRASHFLAG", "", "", 2, "CRASHFLAG", nullptr);
   declarerUnites();
-  services::chargerServices();
 }
 
 }  // namespace registry

@@ -1,5 +1,6 @@
-// Loading the library: the load-time declarations of every unit, in load order,
-// and the stand-ins of the accounting application's modules.
+// Loading the library: the load-time declarations of every unit, in load order. The
+// modules of the accounting application that it calls by name are loaded beside it
+// by whoever hosts it (services::chargerServices for the stand-ins).
 #pragma once
 
 namespace registry {

@@ -18,6 +18,9 @@ using host::fabriquer;
 using host::Module;
 
 void chargerServices() {
+  static bool loaded = false;
+  if (loaded) return;
+  loaded = true;
   Module("", "CPMESSAG-INTERFACE", &fabriquer<Cpmessag>, false, "");
   Module("", "COMPTA-MOD_CAL_BIBLIOPROC", &fabriquer<Compta>, false, "");
   Module("", "COMPTA-VISUECRI", &fabriquer<Visuecri>, false, "");

@@ -4,6 +4,7 @@
 
 namespace services {
 
+// Registers them once per process; later calls do nothing.
 void chargerServices();
 
 }  // namespace services

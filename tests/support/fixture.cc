@@ -4,6 +4,7 @@
 #include <unistd.h>
 
 #include "registry/library.h"
+#include "services/services.h"
 
 namespace testing_support {
 
@@ -45,6 +46,7 @@ std::vector<std::string> incoherences(host::Database& db) {
 
 void DossierTest::SetUp() {
   registry::chargerBibliotheque();
+  services::chargerServices();
   host::clock::setToday(jourDeTest());
   host::clock::setTimeOfDay("10:30:00");
   path_ = cheminTemporaire("mirvae-test");
