@@ -172,19 +172,22 @@ TEST_F(Acces1Test, ActionsOpenTheEntryScreenWithIdentAndMode) {
   EXPECT_EQ(v("VIDENT"), "");
 }
 
-TEST_F(Acces1Test, ClosedYearRefusedReopeningOnlyAllowsConsultation) {
+TEST_F(Acces1Test, ClosedYearNotReopenedOnlyAllowsConsultation) {
   base().exec("UPDATE PARAM SET PXCLO = 'C'");
   ouvrirEcran();
   mains::saisir(session(), "VMOIAN", "");
-  user_.ajouterOui(false);
-  user_.ajouterOui(false);
-  mains::appuyer(session(), "MODIFIER");
-  mains::appuyer(session(), "CREER");
+  // Declined at the screen's question, or at the reopening's own confirmation.
+  for (const std::vector<bool>& answers : {std::vector<bool>{false}, std::vector<bool>{true, false}})
+    for (const char* action : {"MODIFIER", "CREER"}) {
+      for (bool answer : answers) user_.ajouterOui(answer);
+      mains::appuyer(session(), action);
+    }
   EXPECT_TRUE(lancements.empty());
+  EXPECT_EQ(sql("SELECT PXCLO FROM PARAM"), "C");
+  EXPECT_EQ(session().transcript().textes("question").size(), 6u);
   mains::appuyer(session(), "GERER");
   ASSERT_EQ(lancements.size(), 1u);
   EXPECT_EQ(lancements[0].mode, "Vv");
-  EXPECT_EQ(session().transcript().textes("question").size(), 2u);
 }
 
 TEST_F(Acces1Test, ClosedYearWithoutReopeningRefusesWithItsLabel) {

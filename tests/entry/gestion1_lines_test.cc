@@ -8,15 +8,37 @@ namespace {
 
 using testing_support::Gestion1Test;
 
+// What the entry screen handed the analytic screen, one launch a text of its
+// parameters joined by "|".
+std::vector<std::string> analyticLaunches;
+
+// Stands in for the analytic screen: records its launch and returns at once.
+struct AnalyticScreen : model::Traitmnt {
+  explicit AnalyticScreen(host::Evt* e) : Traitmnt(e) {
+    std::string params;
+    for (int i = 0; i < e->nbParams(); ++i) params += (i ? "|" : "") + e->parametre(i).chaine();
+    analyticLaunches.push_back(params);
+  }
+};
+
 class LignesTest : public Gestion1Test {
  protected:
   void SetUp() override {
     Gestion1Test::SetUp();
+    analyticLaunches.clear();
+    testing_support::moduleDeTest<AnalyticScreen>("MIRVAE-GEST_ANA");
+    analytic_ = host::Registre::instance().substituer("MIRVAE-GEST_ANA", &host::fabriquer<AnalyticScreen>);
     // A code of the old normal rate, still in force, to compute at 19.6 %.
     sql("INSERT INTO CDTVA (COTVA, LIBELLE, TYTVA, CITVA, CETVA) VALUES ('V196', 'Ancien taux', 'V', '445711', "
         "'445800')");
     sql("INSERT INTO HISTVA (COTVA, DTDEB, TXTVA) VALUES ('V196', '1990-01-01', 19.6)");
   }
+  void TearDown() override {
+    host::Registre::instance().substituer("MIRVAE-GEST_ANA", analytic_);
+    Gestion1Test::TearDown();
+  }
+
+  host::Fabrique analytic_ = nullptr;
 };
 
 struct Montants {
@@ -199,8 +221,8 @@ TEST_F(LignesTest, TotalsFollowTheLinesAndFallBackToTheSavedOnes) {
 }
 
 TEST_F(LignesTest, AnalyticBreakdownIsAskedOnlyForAnAccountThatTakesIt) {
-  // Revenue accounts of nature "Q" take analytics, and the analytic screen is not
-  // part of this library yet: going back to such a line and validating it calls it.
+  // Revenue accounts of nature "Q" take analytics: on going back to such a line, the
+  // button opens the analytic screen.
   ASSERT_TRUE(creer());
   ASSERT_TRUE(client());
   ASSERT_TRUE(ligne("708500", "100"));
@@ -214,10 +236,37 @@ TEST_F(LignesTest, AnalyticBreakdownIsAskedOnlyForAnAccountThatTakesIt) {
   ASSERT_TRUE(model::allerLigne(session(), 2));
   EXPECT_EQ(valeur("ANA_O_N"), "1");
   EXPECT_FALSE(ecran().ecran()->estInterdit("BT_ANALYTIQUE"));
-  EXPECT_FALSE(appuyer("BT_ANALYTIQUE"));
-  auto errors = session().transcript().textes("erreur");
-  ASSERT_FALSE(errors.empty());
-  EXPECT_NE(errors.back().find("MIRVAE-GEST_ANA"), std::string::npos) << errors.back();
+  EXPECT_TRUE(analyticLaunches.empty());
+  EXPECT_TRUE(appuyer("BT_ANALYTIQUE"));
+  EXPECT_EQ(analyticLaunches.size(), 1u);
+}
+
+TEST_F(LignesTest, TheAnalyticScreenGetsTheLineAsACreditOrAReversedDebit) {
+  sql("UPDATE COMPT SET CSECT = 'ATELIER', SAANA = 'O' WHERE NUMCP = '706000'");
+  const struct {
+    const char* saisieMtt;
+    const char* typed;
+    const char* debitCreditSign;  // of the amount excluding tax, whichever was typed
+  } cases[] = {
+      {"1", "100", "0.00|100.00|1"},
+      {"1", "-100", "100.00|0.00|-1"},
+      {"2", "120", "0.00|100.00|1"},
+      {"2", "-120", "100.00|0.00|-1"},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(std::string(c.saisieMtt) + " " + c.typed);
+    ASSERT_TRUE(creer());
+    ASSERT_TRUE(saisir("MIRVAE.SAISIE_MTT", c.saisieMtt));
+    ASSERT_TRUE(client());
+    ASSERT_TRUE(ligne("706000", c.typed));
+    ASSERT_TRUE(model::allerLigne(session(), 1));
+    analyticLaunches.clear();
+    ASSERT_TRUE(appuyer("BT_ANALYTIQUE"));
+    ASSERT_EQ(analyticLaunches.size(), 1u);
+    EXPECT_EQ(analyticLaunches[0], valeur("LST_MIRVAL.IDENT") + "|VMm|15/03/2024|1|PROD|ATEL|ATELIER|" +
+                                       c.debitCreditSign + "|O");
+    model::fermer(session());
+  }
 }
 
 }  // namespace

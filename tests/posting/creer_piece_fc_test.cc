@@ -1,12 +1,14 @@
 #include "posting/creer_piece_fc.h"
 
 #include <algorithm>
+#include <map>
 
 #include <gtest/gtest.h>
 
 #include "host/registry.h"
 #include "services/cppiece.h"
 #include "tests/posting/posting_fixture.h"
+#include "tests/support/library_double.h"
 
 namespace {
 
@@ -23,6 +25,8 @@ class CreerPieceFcTest : public testing_support::PostingTest {
     hooks.failCode = code;
     hooks.seen = 0;
   }
+
+  testing_support::LibraryDouble import_{"CPPIECE-INTERFACE"};
 };
 
 TEST_F(CreerPieceFcTest, ClientInvoicePostsRowsAndCallsInOrder) {
@@ -93,6 +97,15 @@ TEST_F(CreerPieceFcTest, LinesMakeTheirMovements) {
     EXPECT_EQ(sql("SELECT MTECH FROM ECHEA WHERE NPIES = '" + npies(op.ident) + "'"), c.dueAmount);
   }
   EXPECT_TRUE(messages().empty());
+}
+
+TEST_F(CreerPieceFcTest, OnlyTheExcludingTaxMovementCarriesTheLineVatCodeAndAnalyticCodes) {
+  ecrire({.lignes = {{"706000", "100", "20", "V20"}, {"707000", "-50", "-5", "V10"}}});
+  base().exec("UPDATE MIRVAL SET CPOST = 'POSTE' || substr(IDENT, -1), CCRIT = 'CLE' || substr(IDENT, -1)");
+  poster();
+  EXPECT_EQ(sql("SELECT group_concat(NUMCP || ':' || COTVA || ':' || CPOST || ':' || CCRIT, ' ') FROM "
+                "(SELECT * FROM MOUVE ORDER BY NLIGS)"),
+            "706000:V20:POSTE1:CLE1 445800::: 707000:V10:POSTE2:CLE2 445713::: 411001:::");
 }
 
 TEST_F(CreerPieceFcTest, VatAccountFollowsTheDossierThenTheLineAccount) {
@@ -170,6 +183,38 @@ TEST_F(CreerPieceFcTest, TheDueDateHangsOnTheTiersMovementOfItsOwnPiece) {
                 "WHERE MOUVE.NUMCP = '411001' AND ECHEA.NPIES = '" + second + "'"),
             "1");
   EXPECT_NE(sql("SELECT INDX1 FROM ECHEA WHERE NPIES = '" + second + "'"), "1");
+}
+
+TEST_F(CreerPieceFcTest, TheProcessClearsOutTheTransferRowsOnceTheyAreConsumed) {
+  // The component's own end of the import would hide whether the process clears out
+  // after itself: that end is put off until the user action ends.
+  auto rows = [this] {
+    std::map<std::string, long long> count;
+    for (const char* table : {"PIECE_IMM", "MOUVE_IMM", "ECHEA_IMM", "VTSEC_IMM"})
+      count[table] = compte(std::string("SELECT count(*) FROM ") + table);
+    return count;
+  };
+  std::map<std::string, long long> atFinPiece, left;
+  import_.answers["FIN_PIECE"] = [&](host::Automate& real, host::Evt* e) {
+    atFinPiece = rows();
+    real.executer("FIN_PIECE", e);
+    return real.erreurMethode();
+  };
+  import_.answers["FIN_IMPORT"] = [](host::Automate&, host::Evt*) { return 0; };
+  import_.atEndOfUnit = [&](host::Automate& real) {
+    left = rows();
+    real.executer("FIN_IMPORT", nullptr);
+  };
+  ecrire({.lignes = {{"706000", "100", "20", "V20", {{"ATELIER", "0", "100"}}}}});
+  poster();
+
+  EXPECT_EQ(atFinPiece["ECHEA_IMM"], 0) << "the due date goes once its movement is closed";
+  EXPECT_EQ(left["PIECE_IMM"], 0);
+  EXPECT_EQ(left["MOUVE_IMM"], 0);
+  EXPECT_EQ(left["ECHEA_IMM"], 0);
+  EXPECT_GT(left["VTSEC_IMM"], 0) << "what the process leaves must still show";
+  EXPECT_EQ(import_.calls.back(), "FIN_IMPORT");
+  EXPECT_EQ(compte("SELECT count(*) FROM PIECE"), 1);
 }
 
 TEST_F(CreerPieceFcTest, NpiesReplacedAsSoonAsDebutPieceSucceeds) {

@@ -6,6 +6,7 @@
 
 #include "posting/verifier_modif_piece.h"
 #include "tests/posting/posting_fixture.h"
+#include "tests/support/library_double.h"
 
 namespace {
 
@@ -58,12 +59,17 @@ class PieceProtegeeTest : public testing_support::PostingTest {
   }
 
   std::string piece_;
+  // The ledger's removal procedures, watched: the ledger refuses by itself a removal
+  // it did not reserve, which would hide a call that should not have been made.
+  testing_support::LibraryDouble ledger_{"COMPTA-MOD_CAL_BIBLIOPROC"};
 };
 
 TEST_F(PieceProtegeeTest, DeletionRemovesEveryRowOfThePieceAndItsReservation) {
   ecrire({.ident = "OP000002", .lignes = {{"706000", "10"}}});
   poster("OP000002");
+  ledger_.calls.clear();
   supprimer(piece_);
+  EXPECT_EQ(ledger_.calls, (Strings{"RESERVER_SUPPR_PIECE", "SUPPRIMER_PIECE", "LIBERER_SUPPR_PIECE"}));
   EXPECT_EQ(compte("SELECT count(*) FROM PIECE WHERE NPIES = '" + piece_ + "'"), 0);
   EXPECT_EQ(compte("SELECT count(*) FROM MOUVE WHERE NPIES = '" + piece_ + "'"), 0);
   EXPECT_EQ(compte("SELECT count(*) FROM ECHEA WHERE NPIES = '" + piece_ + "'"), 0);
@@ -82,6 +88,7 @@ TEST_F(PieceProtegeeTest, DeletionWithEmptyOrUnknownNumberDoesNothing) {
   supprimer("");
   supprimer("00000009999");
   EXPECT_EQ(lignesDuGrandLivre(), before);
+  EXPECT_TRUE(ledger_.calls.empty());
   EXPECT_TRUE(messages().empty());
 }
 
@@ -97,7 +104,9 @@ TEST_F(PieceProtegeeTest, RefusedReservationKeepsThePieceWhole) {
   for (const auto& [name, protect] : cases) {
     SCOPED_TRACE(name);
     protect();
+    ledger_.calls.clear();
     supprimer(piece_);
+    EXPECT_EQ(ledger_.calls, Strings{"RESERVER_SUPPR_PIECE"}) << "neither removal nor release without a reservation";
     EXPECT_EQ(lignesDuGrandLivre(), before);
     EXPECT_EQ(compte("SELECT count(*) FROM PIECE_RESERVEE WHERE PROPRIETAIRE <> 'autre@1#1'"), 0);
     deproteger();
