@@ -3,8 +3,7 @@
 #include <atomic>
 #include <unistd.h>
 
-#include "registry/library.h"
-#include "services/services.h"
+#include "app/script.h"
 
 namespace testing_support {
 
@@ -45,8 +44,7 @@ std::vector<std::string> incoherences(host::Database& db) {
 }
 
 void DossierTest::SetUp() {
-  registry::chargerBibliotheque();
-  services::chargerServices();
+  app::chargerModules();
   host::clock::setToday(jourDeTest());
   host::clock::setTimeOfDay("10:30:00");
   path_ = cheminTemporaire("mirvae-test");

@@ -4,8 +4,8 @@
 #include <iterator>
 #include <stdexcept>
 
+#include "app/script.h"
 #include "host/error.h"
-#include "registry/library.h"
 
 namespace testing_support {
 
@@ -56,7 +56,7 @@ constexpr host::Fabrique kStands[] = {&host::fabriquer<Stand<0>>, &host::fabriqu
 }  // namespace
 
 LibraryDouble::LibraryDouble(std::string name) : name_(std::move(name)) {
-  registry::chargerBibliotheque();
+  app::chargerModules();
   auto free = std::find(std::begin(active), std::end(active), nullptr);
   if (free == std::end(active)) throw std::logic_error("trop de doublures de bibliothèques à la fois");
   slot_ = static_cast<int>(free - std::begin(active));
