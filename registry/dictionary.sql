@@ -87,6 +87,8 @@ CREATE TABLE "MIRVAANA" (
   "MTACR"          MONEY TEXT NOT NULL DEFAULT '0',
   PRIMARY KEY ("NUMERO", "IDENT")
 );
+-- The identifier counter reads the largest IDENT at each draw.
+CREATE INDEX "MIRVAANA_IDENT" ON "MIRVAANA" ("IDENT");
 
 -- Due dates of the ledger settled by a bank or cash line.
 CREATE TABLE "MIRVAJUS" (
