@@ -374,6 +374,8 @@ CREATE TABLE "VTSEC" (
   "MTACR"          MONEY TEXT NOT NULL DEFAULT '0'
 );
 CREATE INDEX "VTSEC_MOUVE_UNIQ" ON "VTSEC" ("MOUVE_UNIQ");
+-- The row counter reads the largest UNIQ at each draw.
+CREATE INDEX "VTSEC_UNIQ" ON "VTSEC" ("UNIQ");
 
 -- Due dates. MTECH is in the keeping currency, MTECHS in the piece's.
 CREATE TABLE "ECHEA" (

@@ -274,9 +274,8 @@ void PieceImport::debut_import(Evt* e) {
   host::Donnee& ninst = e->parametre(0);
   // An instance left open by an import that stopped half-way is given up.
   if (instance_) closeInstance("A");
-  std::string number =
-      host::nextNumberText(db(), "IMPORT_INSTANCE", kInstanceNumberWidth,
-                           host::UsedNumbers{.table = "IMPORT_INSTANCE", .column = "NINST", .width = kInstanceNumberWidth});
+  host::UsedNumbers used{.table = "IMPORT_INSTANCE", .column = "NINST", .width = kInstanceNumberWidth};
+  std::string number = host::nextNumberText(db(), "IMPORT_INSTANCE", kInstanceNumberWidth, used);
   execute(db(), "INSERT INTO \"IMPORT_INSTANCE\" (\"NINST\", \"ETAT\", \"DTCRE\") VALUES (?, 'O', ?)", number,
           host::jourIso(host::clock::today()));
   instance_ = Instance{number, std::nullopt, {}};
@@ -304,8 +303,8 @@ int PieceImport::debutPiece(host::Donnee& npies) {
   piece.currency = row->at("MONNAIE_IDENT");
   piece.rate = row->at("COURS").empty() ? 0 : std::stod(row->at("COURS"));
   piece.origin = row->at("CORIG");
-  piece.npies = host::nextNumberText(db(), "PIECE", kPieceNumberWidth,
-                                     host::UsedNumbers{.table = "PIECE", .column = "NPIES", .width = kPieceNumberWidth});
+  host::UsedNumbers used{.table = "PIECE", .column = "NPIES", .width = kPieceNumberWidth};
+  piece.npies = host::nextNumberText(db(), "PIECE", kPieceNumberWidth, used);
   npies = piece.npies;
   instance_->piece = std::move(piece);
   return kImportOk;
@@ -535,8 +534,8 @@ void PieceImport::write(const Piece& piece) {
         execute(base,
                 "INSERT INTO \"VTSEC\" (\"UNIQ\", \"MOUVE_UNIQ\", \"CSECT\", \"MTADE\", \"MTACR\") "
                 "VALUES (?, ?, ?, ?, ?)",
-                host::nextNumber(base, "VTSEC", host::UsedNumbers{.table = "VTSEC", .column = "UNIQ"}), m.uniq, a.section,
-                a.debit.toString(0), a.credit.toString(0));
+                host::nextNumber(base, "VTSEC", host::UsedNumbers{.table = "VTSEC", .column = "UNIQ"}), m.uniq,
+                a.section, a.debit.toString(0), a.credit.toString(0));
       for (const DueDate& d : m.dueDates) {
         std::string amount = d.amount.toString(0), keepingAmount = d.keepingAmount.toString(0);
         execute(base,
