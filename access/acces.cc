@@ -53,9 +53,7 @@ void MIRVAEAcces::quitter(Evt* e) {
   sortir(e, 0);
 }
 
-std::string MIRVAEAcces::anneeMoisNouvelExercice() {
-  return DATE_DEBUT_NOUVEL_E(7, 10) + DATE_DEBUT_NOUVEL_E(4, 5);
-}
+std::string MIRVAEAcces::anneeMoisNouvelExercice() { return host::yearMonth(DATE_DEBUT_NOUVEL_E.jour()); }
 
 // ---------------------------------------------------------------------------- start
 

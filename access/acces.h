@@ -114,7 +114,7 @@ class MIRVAEAcces : public model::Acces2 {
   void messageOk(const std::string& text);
   // Leaves the screen at once, without pending messages.
   void quitter(Evt* e);
-  // The YYYYMM of DATE_DEBUT_NOUVEL_E, from its DD/MM/YYYY text.
+  // The YYYYMM of DATE_DEBUT_NOUVEL_E.
   std::string anneeMoisNouvelExercice();
   void verifierBorne(Evt* e, Date& date, const char* start, const char* control);
   void ouvrirGestion(const char* mode);

@@ -5,6 +5,7 @@
 #include "host/currency.h"
 #include "host/error.h"
 #include "host/session.h"
+#include "host/text.h"
 #include "model/interface.h"
 
 namespace entry {
@@ -12,7 +13,7 @@ namespace entry {
 namespace {
 
 constexpr const char* kCrLf = "\r\n";
-constexpr const char* kPlaceholder = "[PIECE]";
+using host::text::kPiecePlaceholder;
 
 }  // namespace
 
@@ -83,14 +84,10 @@ void EntryScreen::readCreationJournal() {
   }
 }
 
-std::string EntryScreen::anneeMois() {
-  if (MIRVAE_DTOPE.estVide()) return "";
-  // DD/MM/YYYY: the year, then the month.
-  return MIRVAE_DTOPE(7, 10) + MIRVAE_DTOPE(4, 5);
-}
+std::string EntryScreen::anneeMois() { return host::yearMonth(MIRVAE_DTOPE.jour()); }
 
 void EntryScreen::remplacerPieceDansLibelle() {
-  EvtParamRef remplacer(3, &MIRVAE_INPIE, kPlaceholder, &MIRVAE_NPIEC);
+  EvtParamRef remplacer(3, &MIRVAE_INPIE, kPiecePlaceholder, &MIRVAE_NPIEC);
   appelerProcedure("*", "SYSASCII", "INTERFACE", "REMPLACER", &remplacer, -1);
 }
 
@@ -261,7 +258,7 @@ void EntryScreen::creat2(Evt* e) {
   MONNAIE_ORIGINE = MIRVAE_MONNAIE_IDENT;
   COURS_ORIGINE = MIRVAE_COURS;
   lireJournal();
-  MIRVAE_NPIEC = JONAL_NUMEROPI == "A" ? kPlaceholder : "";
+  MIRVAE_NPIEC = JONAL_NUMEROPI == "A" ? kPiecePlaceholder : "";
   if (JONAL_PREFIXIN.estVide()) MIRVAE_INPIE = kind_.defaultLabel;
   // The copy has no ledger piece of its own.
   MIRVAE_NPIES = "";
@@ -286,7 +283,7 @@ void EntryScreen::debut_creation(Evt* e) {
   MIRVAE_DTOPE = Date::dateCourante();
   // A day the ledger would refuse is not proposed: the user types the date.
   if (MIRVAE_DTOPE > DATE_CLOTURE || MIRVAE_DTOPE < PARAM_PDDEX) MIRVAE_DTOPE = "";
-  if (JONAL_NUMEROPI == "A") MIRVAE_NPIEC = kPlaceholder;
+  if (JONAL_NUMEROPI == "A") MIRVAE_NPIEC = kPiecePlaceholder;
 
   if (kind_.currency == registry::CreationCurrency::Dossier)
     MIRVAE_MONNAIE_IDENT = PARAM_MONNAIE_IDENT;

@@ -4,6 +4,7 @@
 #include "entry/gestion.h"
 
 #include "host/currency.h"
+#include "host/text.h"
 
 namespace entry {
 
@@ -131,7 +132,7 @@ void EntryScreen::addModelLine() {
 
 void EntryScreen::importation_lignes(Evt*) {
   procedure("INCREMENTE_NUMERO_PIECE");
-  if (!MIRVAE_NPIEC.estVide() && MIRVAE_INPIE.position("[PIECE]") > 0) remplacerPieceDansLibelle();
+  if (!MIRVAE_NPIEC.estVide() && MIRVAE_INPIE.position(host::text::kPiecePlaceholder) > 0) remplacerPieceDansLibelle();
   ecran()->affiche("NPIEC", "INPIE", "");
 
   Devises& devises = euro();
@@ -139,14 +140,14 @@ void EntryScreen::importation_lignes(Evt*) {
   devises.definirCourante(MIRVAE_MONNAIE_IDENT.chaine(), MIRVAE_DTOPE.jour());
   MIRVAE_COURS = devises.coursCourant();
 
-  // Amounts go from the source's rate to the copy's. Each is rounded to the
+  // Every amount is scaled by the source's rate over the copy's, rounded to the
   // currency's decimals, and TTC stays HT + TVA, so that the copy posts as
   // exactly as a typed piece.
   std::string currency = MIRVAE_MONNAIE_IDENT.chaine();
   Decimal newRate = MIRVAE_COURS.decimal(), oldRate = COURS_ORIGINE.decimal();
   // A source saved without its rate keeps its amounts rather than losing them.
   if (oldRate.sign() <= 0) oldRate = newRate;
-  auto atNewRate = [&](const Donnee& amount) { return devises.arrondir(amount.decimal() / newRate * oldRate, currency); };
+  auto atNewRate = [&](const Donnee& amount) { return devises.reprice(amount.decimal(), newRate, oldRate, currency); };
 
   MIRVAL2.initRequete();
   MIRVAL2.ajouteFiltre(MIRVAL2_NUMERO, '/', IDENT_ORIGINE.chaine() + "|");

@@ -5,14 +5,11 @@
 #include <chrono>
 
 #include "entry/gestion.h"
+#include "host/text.h"
 
 namespace entry {
 
-namespace {
-
-constexpr const char* kPlaceholder = "[PIECE]";
-
-}  // namespace
+using host::text::kPiecePlaceholder;
 
 void EntryScreen::npiec_entree(Evt*) { procedure("PREFIXE_NUMERO_PIECE"); }
 
@@ -22,7 +19,7 @@ void EntryScreen::prefixe_numero_piece(Evt*) {
   // The prefix is made of the operation's year and month: none before the date is known.
   std::string yearMonth = anneeMois();
   if (yearMonth.empty()) return;
-  if (MIRVAE_NPIEC == kPlaceholder) {
+  if (MIRVAE_NPIEC == kPiecePlaceholder) {
     MIRVAE_NPIEC = prefixe(JONAL_PREFIXPI, yearMonth);
     ecran()->affiche("NPIEC", "");
   }
@@ -38,16 +35,16 @@ void EntryScreen::npiec(Evt* e) {
     rejeter(e);
     return;
   }
-  if (!MIRVAE_NPIEC.estVide() && !automatique && MIRVAE_INPIE.position(kPlaceholder) > 0) {
+  if (!MIRVAE_NPIEC.estVide() && !automatique && MIRVAE_INPIE.position(kPiecePlaceholder) > 0) {
     remplacerPieceDansLibelle();
     ecran()->affiche("INPIE", "");
   }
-  if (MIRVAE_NPIEC != kPlaceholder && automatique) {
+  if (MIRVAE_NPIEC != kPiecePlaceholder && automatique) {
     bool oui = question("Le journal " + MIRVAE_NUMJL.chaine() + " est défini avec une numérotation automatique." +
                         "@Confirmez-vous la saisie du N° pièce ?");
     V_CHOIX = oui ? 1 : 0;
     if (V_CHOIX != "1") {
-      MIRVAE_NPIEC = kPlaceholder;
+      MIRVAE_NPIEC = kPiecePlaceholder;
       ecran()->affiche("NPIEC", "");
       controler("NPIEC");
       rejeter(e);
@@ -74,13 +71,13 @@ void EntryScreen::lst_entree(Evt*) {
   if (!enCreation()) return;
   procedure("INCREMENTE_NUMERO_PIECE");
   if (refuse()) return;
-  if (MIRVAE_INPIE.position(kPlaceholder) > 0) remplacerPieceDansLibelle();
+  if (MIRVAE_INPIE.position(kPiecePlaceholder) > 0) remplacerPieceDansLibelle();
   ecran()->affiche("NPIEC", "INPIE", "");
 }
 
 void EntryScreen::incremente_numero_piece(Evt* e) {
   lireJournal();
-  if (MIRVAE_NPIEC != kPlaceholder || JONAL_NUMEROPI != "A") return;
+  if (MIRVAE_NPIEC != kPiecePlaceholder || JONAL_NUMEROPI != "A") return;
   // The counter's period comes from the date: nothing is drawn before it is known.
   std::string yearMonth = anneeMois();
   if (yearMonth.empty()) return;

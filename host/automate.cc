@@ -173,7 +173,7 @@ void Automate::ctrl_basculer(Evt* e) {
     Decimal toRate = devises.coursCourant();
     if (fromRate.sign() <= 0)
       throw HostError("cours « " + fromRate.toString(0) + " » de la monnaie « " + from + " » invalide");
-    convertAmounts([&](const Decimal& amount) { return devises.arrondir(amount * toRate / fromRate, to); });
+    convertAmounts([&](const Decimal& amount) { return devises.reprice(amount, fromRate, toRate, to); });
   }
   if (aBranche("CTRL_ACTUALISER_BASCULE")) executer("CTRL_ACTUALISER_BASCULE", e);
 }

@@ -17,6 +17,11 @@ std::string quoted(std::string_view text) {
   return "« " + std::string(text.substr(0, kShown)) + (text.size() > kShown ? "…" : "") + " »";
 }
 
+// The rate rule without its rounding: the product first, then the one division.
+Decimal scaled(const Decimal& amount, const Decimal& fromRate, const Decimal& toRate) {
+  return amount * toRate / fromRate;
+}
+
 }  // namespace
 
 std::string amountText(const Decimal& amount, int decimals) { return amount.toFixed(decimals); }
@@ -94,12 +99,16 @@ Decimal Devises::convertir(const Decimal& amount, std::string_view from, std::st
     facts(from);
     return amount;
   }
-  // One multiplication and one division: the fewest steps where a division can cut decimals.
-  return amount * cours(to, day) / cours(from, day);
+  return scaled(amount, cours(from, day), cours(to, day));
 }
 
 Decimal Devises::arrondir(const Decimal& amount, std::string_view ident) const {
   return Monnaie::valeurArrondie(amount, decimales(ident), "=");
+}
+
+Decimal Devises::reprice(const Decimal& amount, const Decimal& fromRate, const Decimal& toRate,
+                         std::string_view ident) const {
+  return arrondir(scaled(amount, fromRate, toRate), ident);
 }
 
 std::string Devises::texte(const Decimal& amount, std::string_view ident) const {
@@ -150,8 +159,8 @@ Decimal Devises::conversion(const Donnee& montant, int sens, const Donnee& date,
   // The current currency goes through its own rate (perhaps typed on the document);
   // the keeping currency through the dossier's rate of the day.
   Decimal keepingRate = cours(keeping, day);
-  if (sens == 0) return arrondir(montant.decimal() * currentRate / keepingRate, current);
-  return arrondir(montant.decimal() * keepingRate / currentRate, keeping);
+  if (sens == 0) return reprice(montant.decimal(), keepingRate, currentRate, current);
+  return reprice(montant.decimal(), currentRate, keepingRate, keeping);
 }
 
 void Devises::definirBascule(std::string_view source, std::string_view cible) {

@@ -69,6 +69,13 @@ class Devises {
   Decimal convertir(const Decimal& amount, std::string_view from, std::string_view to, const Jour& day) const;
   // Rounded to the decimals of `ident`, to the nearest, ties away from zero.
   Decimal arrondir(const Decimal& amount, std::string_view ident) const;
+  // `amount` at rate `fromRate` re-priced at rate `toRate`, as every road that moves an
+  // amount between rates does it (a copied operation, the currency switch, the ledger's
+  // valuation): amount × toRate ÷ fromRate, rounded once, as arrondir, to the decimals
+  // of `ident`, the currency it ends in. The one division comes after the product, so
+  // that no decimal is cut before the rounding: 0.25 from rate 3 to rate 1.5 is 0.125,
+  // hence 0.13, where dividing first would have made it 0.12. `fromRate` must not be 0.
+  Decimal reprice(const Decimal& amount, const Decimal& fromRate, const Decimal& toRate, std::string_view ident) const;
   // amountText and typedAmount with the decimals of `ident`.
   std::string texte(const Decimal& amount, std::string_view ident) const;
   Decimal saisi(std::string_view text, std::string_view ident, std::string_view what) const;

@@ -7,6 +7,10 @@
 
 namespace host::text {
 
+// What a piece number and a piece label hold while the piece's number is not drawn
+// yet; the number replaces it once drawn.
+inline constexpr const char* kPiecePlaceholder = "[PIECE]";
+
 // Number of characters (code points) in `s`.
 std::size_t length(std::string_view s);
 // Characters `from` to `to`, counted from 1, both included; clipped to the text.

@@ -44,6 +44,13 @@ std::string jourIso(const Jour& day) {
   return buffer;
 }
 
+std::string yearMonth(const Jour& day) {
+  if (!day) return {};
+  char buffer[16];
+  std::snprintf(buffer, sizeof buffer, "%04d%02u", int(day->year()), unsigned(day->month()));
+  return buffer;
+}
+
 namespace {
 
 bool readNumber(std::string_view s, int& out) {

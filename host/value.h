@@ -32,6 +32,9 @@ using Jour = std::optional<std::chrono::year_month_day>;
 // Text forms of dates: "DD/MM/YYYY" for people, "YYYY-MM-DD" for storage.
 std::string jourTexte(const Jour& day);
 std::string jourIso(const Jour& day);
+// The year and month of a day, "YYYYMM": the form counters and closed periods are
+// kept in, and compared as text. "" for the empty date.
+std::string yearMonth(const Jour& day);
 // Reads "DD/MM/YYYY", "D/M/YYYY", "DDMMYYYY" or "YYYY-MM-DD"; "" is the empty date.
 // Returns nothing for any other text and for an impossible day (31/02/2024).
 std::optional<Jour> lireJour(std::string_view text);

@@ -1,5 +1,6 @@
 #include "model/interface.h"
 
+#include "host/database.h"
 #include "host/error.h"
 #include "host/registry.h"
 #include "host/session.h"
@@ -7,11 +8,7 @@
 
 namespace model {
 
-std::string requeteFiche(const std::string& ident) {
-  std::string literal;
-  for (char c : ident) literal += c == '\'' ? std::string("''") : std::string(1, c);
-  return "Select * From TABLE Where IDENT = '" + literal + "'";
-}
+std::string requeteFiche(const std::string& ident) { return "Select * From TABLE Where IDENT = " + quoteText(ident); }
 
 Interface2::Interface2(Evt* e) : Interface(e) {
   addBaseBranch("IMPRESSION", [this](Evt* ev) { impression(ev); });

@@ -1,10 +1,10 @@
 #include "model/saisie.h"
 
+#include "host/counter.h"
 #include "host/error.h"
 #include "host/session.h"
 #include "host/snapshot.h"
 #include "host/table.h"
-#include "model/numbering.h"
 #include "model/step.h"
 
 namespace model {
@@ -173,7 +173,7 @@ void Saisie::validation(Evt*) {
     // Made a new record again: an earlier attempt that was undone must not turn
     // this insert into an update of a row that no longer exists.
     makeNew(header);
-    ident = prochainIdentifiant(session().base(), nomTable(), kIdentWidth);
+    ident = host::nextIdentifier(session().base(), nomTable(), kIdentWidth);
     header.affecter("IDENT", Valeur::texte(ident));
   } else {
     ident = identifiantDocument();

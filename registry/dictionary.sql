@@ -87,6 +87,8 @@ CREATE TABLE "MIRVAANA" (
   "MTACR"          MONEY TEXT NOT NULL DEFAULT '0',
   PRIMARY KEY ("NUMERO", "IDENT")
 );
+-- The identifier counter reads the largest IDENT at each draw.
+CREATE INDEX "MIRVAANA_IDENT" ON "MIRVAANA" ("IDENT");
 
 -- Due dates of the ledger settled by a bank or cash line.
 CREATE TABLE "MIRVAJUS" (
@@ -372,6 +374,8 @@ CREATE TABLE "VTSEC" (
   "MTACR"          MONEY TEXT NOT NULL DEFAULT '0'
 );
 CREATE INDEX "VTSEC_MOUVE_UNIQ" ON "VTSEC" ("MOUVE_UNIQ");
+-- The row counter reads the largest UNIQ at each draw.
+CREATE INDEX "VTSEC_UNIQ" ON "VTSEC" ("UNIQ");
 
 -- Due dates. MTECH is in the keeping currency, MTECHS in the piece's.
 CREATE TABLE "ECHEA" (

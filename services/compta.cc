@@ -1,7 +1,6 @@
 #include "services/compta.h"
 
 #include <chrono>
-#include <cstdio>
 
 #include "host/clock.h"
 #include "host/currency.h"
@@ -24,12 +23,6 @@ constexpr const char* kOptions[] = {"OPT_TVA",    "OPT_TVA1",   "OPT_QTE",    "O
                                     "OPT_ANA",    "OPT_ANA1",   "OPT_ANA2",   "OPT_ECHCLI", "OPT_ECHFOU",
                                     "OPT_ECHAUT", "OPT_ECH",    "OPT_DEVISE", "OPT_REGT"};
 constexpr int kOptionCount = sizeof kOptions / sizeof kOptions[0];
-
-std::string yearMonth(const year_month_day& day) {
-  char buffer[16];  // room for any year the calendar types allow
-  std::snprintf(buffer, sizeof buffer, "%04d%02u", int(day.year()), unsigned(day.month()));
-  return buffer;
-}
 
 // A year-month "YYYYMM" with a real month.
 bool isYearMonth(const std::string& text) {
@@ -107,7 +100,7 @@ void Compta::table_annee_mois(Evt* e) {
   year_month last = closing->year() / closing->month();
   for (; current <= last; current += months(1)) {
     MEM02.raz();
-    ANMOI = yearMonth(current / day(1));
+    ANMOI = host::yearMonth(current / day(1));
     MEM02.ecrit();
   }
 }

@@ -7,6 +7,7 @@
 
 #include "host/automate.h"
 #include "host/clock.h"
+#include "host/counter.h"
 #include "host/currency.h"
 #include "host/database.h"
 #include "host/decimal.h"
@@ -43,34 +44,6 @@ std::string padded(long long n, int width) {
   std::string digits = std::to_string(n);
   return digits.size() >= static_cast<std::size_t>(width) ? digits
                                                           : std::string(width - digits.size(), '0') + digits;
-}
-
-// The next number of an NDOC counter. It never goes down and never falls below the
-// largest number already in the ledger (`usedMax` selects it), so a number is never
-// handed out twice, even once its piece is gone.
-long long nextNumber(Database& db, const std::string& counter, const std::string& usedMax) {
-  execute(db, "INSERT OR IGNORE INTO \"NDOC\" (\"NOM\", \"DERNIER\") VALUES (?, 0)", counter);
-  host::Statement& next = bound(db,
-                                "UPDATE \"NDOC\" SET \"DERNIER\" = max(\"DERNIER\", (" + usedMax +
-                                    ")) + 1 WHERE \"NOM\" = ? RETURNING \"DERNIER\"",
-                                counter);
-  next.step();
-  long long n = next.integer(0);
-  next.reset();
-  return n;
-}
-
-// The largest number of `width` digits in a text key column, as the query `usedMax`
-// of nextNumber wants it. The numbers this component hands out all have that width,
-// so only those can collide with the next one; among them text order is number order,
-// and the key's index gives the largest at once instead of reading the whole table
-// each time a piece is numbered.
-std::string largestNumber(const std::string& table, const std::string& column, int width) {
-  std::string quoted = "\"" + column + "\"";
-  return "SELECT coalesce((SELECT CAST(" + quoted + " AS INTEGER) FROM \"" + table + "\" WHERE " + quoted +
-         " BETWEEN '" + std::string(width, '0') + "' AND '" + std::string(width, '9') + "' AND length(" + quoted +
-         ") = " + std::to_string(width) + " AND " + quoted + " NOT GLOB '*[^0-9]*' ORDER BY " + quoted +
-         " DESC LIMIT 1), 0)";
 }
 
 struct Allocation {
@@ -128,7 +101,7 @@ void value(Piece& piece, const std::string& keeping) {
   }
   Rates rates = ratesOf(piece, keeping);
   auto convert = [&](const Decimal& amount) {
-    return host::euro().arrondir(amount * rates.keeping / rates.piece, keeping);
+    return host::euro().reprice(amount, rates.piece, rates.keeping, keeping);
   };
   Decimal gap;  // debits minus credits
   for (Movement& m : piece.movements) {
@@ -302,9 +275,8 @@ void PieceImport::debut_import(Evt* e) {
   host::Donnee& ninst = e->parametre(0);
   // An instance left open by an import that stopped half-way is given up.
   if (instance_) closeInstance("A");
-  std::string number = padded(
-      nextNumber(db(), "IMPORT_INSTANCE", largestNumber("IMPORT_INSTANCE", "NINST", kInstanceNumberWidth)),
-      kInstanceNumberWidth);
+  host::UsedNumbers used{.table = "IMPORT_INSTANCE", .column = "NINST", .width = kInstanceNumberWidth};
+  std::string number = host::nextNumberText(db(), "IMPORT_INSTANCE", kInstanceNumberWidth, used);
   execute(db(), "INSERT INTO \"IMPORT_INSTANCE\" (\"NINST\", \"ETAT\", \"DTCRE\") VALUES (?, 'O', ?)", number,
           host::jourIso(host::clock::today()));
   instance_ = Instance{number, std::nullopt, {}};
@@ -332,8 +304,8 @@ int PieceImport::debutPiece(host::Donnee& npies) {
   piece.currency = row->at("MONNAIE_IDENT");
   piece.rate = row->at("COURS").empty() ? 0 : std::stod(row->at("COURS"));
   piece.origin = row->at("CORIG");
-  piece.npies = padded(
-      nextNumber(db(), "PIECE", largestNumber("PIECE", "NPIES", kPieceNumberWidth)), kPieceNumberWidth);
+  host::UsedNumbers used{.table = "PIECE", .column = "NPIES", .width = kPieceNumberWidth};
+  piece.npies = host::nextNumberText(db(), "PIECE", kPieceNumberWidth, used);
   npies = piece.npies;
   instance_->piece = std::move(piece);
   return kImportOk;
@@ -358,7 +330,7 @@ int PieceImport::debutLigne(Evt* e) {
   m.vatCode = row->at("COTVA");
   m.post = row->at("CPOST");
   m.key = row->at("CCRIT");
-  m.uniq = nextNumber(db(), "MOUVE", "SELECT coalesce(max(\"UNIQ\"), 0) FROM \"MOUVE\"");
+  m.uniq = host::nextNumber(db(), "MOUVE", host::UsedNumbers{.table = "MOUVE", .column = "UNIQ"});
   if (e->nbParams() > 0) e->parametre(0) = host::Valeur::entier(m.uniq);
   piece.movements.push_back(std::move(m));
   piece.movementOpen = true;
@@ -498,7 +470,7 @@ std::vector<std::string> PieceImport::faults(const Piece& piece) {
     if (!lastDay.empty() && iso > lastDay)
       out.push_back("La date du " + shown + " dépasse la date de clôture de la saisie (" +
                     host::jourTexte(*host::lireJour(lastDay)) + ").");
-    std::string month = iso.substr(0, 4) + iso.substr(5, 2);
+    std::string month = host::yearMonth(piece.date);
     if (closedUntil && !closedUntil->empty() && month <= *closedUntil)
       out.push_back("La période " + iso.substr(5, 2) + "/" + iso.substr(0, 4) + " est clôturée pour le journal « " +
                     piece.journal + " ».");
@@ -565,15 +537,15 @@ void PieceImport::write(const Piece& piece) {
         execute(base,
                 "INSERT INTO \"VTSEC\" (\"UNIQ\", \"MOUVE_UNIQ\", \"CSECT\", \"MTADE\", \"MTACR\") "
                 "VALUES (?, ?, ?, ?, ?)",
-                nextNumber(base, "VTSEC", "SELECT coalesce(max(\"UNIQ\"), 0) FROM \"VTSEC\""), m.uniq, a.section,
-                a.debit.toString(0), a.credit.toString(0));
+                host::nextNumber(base, "VTSEC", host::UsedNumbers{.table = "VTSEC", .column = "UNIQ"}), m.uniq,
+                a.section, a.debit.toString(0), a.credit.toString(0));
       for (const DueDate& d : m.dueDates) {
         std::string amount = d.amount.toString(0), keepingAmount = d.keepingAmount.toString(0);
         execute(base,
                 "INSERT INTO \"ECHEA\" (\"NUSYS\", \"UNIQ\", \"NPIES\", \"INDX1\", \"UNIQR\", \"DTECH\", \"CTYPR\", "
                 "\"NJLTR\", \"CTYEC\", \"BPECH\", \"MTECH\", \"MTECHS\", \"MTRES\", \"MTRESS\") "
                 "VALUES (?1, ?2, ?3, ?4, 0, ?5, ?6, ?7, ?8, ?9, ?10, ?11, ?10, ?11)",
-                nextNumber(base, "ECHEA", "SELECT coalesce(max(\"NUSYS\"), 0) FROM \"ECHEA\""), m.uniq,
+                host::nextNumber(base, "ECHEA", host::UsedNumbers{.table = "ECHEA", .column = "NUSYS"}), m.uniq,
                 piece.npies, std::to_string(m.uniq), host::jourIso(d.date), d.terms, d.journal, d.type, d.method,
                 keepingAmount, amount);
       }

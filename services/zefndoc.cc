@@ -1,9 +1,9 @@
 #include "services/zefndoc.h"
 
+#include "host/counter.h"
 #include "host/database.h"
 #include "host/error.h"
 #include "host/session.h"
-#include "model/numbering.h"
 #include "services/common.h"
 
 namespace services {
@@ -44,7 +44,7 @@ void Zefndoc::attribue_numero(Evt* e) {
   Request r = readRequest(e);
   Database& db = session().base();
   std::string ident;
-  dansUnite(db, [&] { ident = model::prochainIdentifiant(db, r.name, r.width); });
+  dansUnite(db, [&] { ident = host::nextIdentifier(db, r.name, r.width); });
   e->parametre(5) = ident;
 }
 

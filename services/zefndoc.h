@@ -4,7 +4,8 @@
 //   "ATTRIBUE_NUMERO" (base, counter table, name, "", width, identifier out)
 //       reserves the next number of the counter `name` ("MIRVAL", "MIRVAANA"...) of
 //       the table NDOC of the base "CP", and writes it into the last parameter as
-//       `width` digits ("00000042"). A number that no longer fits the width is a
+//       `width` digits ("00000042"), above every identifier of that width already in
+//       the table of that name. A number that no longer fits the width is a
 //       HostError: a wider identifier would break the key order of the rows.
 //   "VALIDE_NUMERO" (the same parameters)   confirms the identifier: it must be one
 //       that the counter has handed out, else HostError.

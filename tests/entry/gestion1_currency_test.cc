@@ -4,6 +4,7 @@
 // line is being typed. Amounts show and are typed with their currency's decimals.
 #include <gtest/gtest.h>
 
+#include <functional>
 #include <sstream>
 
 #include "app/exports.h"
@@ -124,6 +125,49 @@ TEST_F(DevisesTest, AConvertedModificationSavesItsAnalyticRowsInTheNewCurrency) 
   EXPECT_EQ(sql("SELECT MONNAIE_IDENT || ' ' || COURS || ' ' || HT || ' ' || TVA || ' ' || TTC FROM MIRVAE"),
             "USD 1.105 165.75 22.1 187.85");
   EXPECT_EQ(sql("SELECT group_concat(MTACR, ' ') FROM (SELECT MTACR FROM MIRVAANA ORDER BY CSECT)"), "66.3 44.2");
+}
+
+// 0.25 from rate 3 to rate 1.5 is exactly 0.125: whichever road moves it between the
+// two rates, it lands on the same cent, the half rounded away from zero.
+TEST_F(DevisesTest, OneRepricingGivesTheSameCentOnEveryRoad) {
+  // Pounds kept at 1.5 for one euro, dollars at 3.
+  sql("INSERT INTO MONNAIE (IDENT, LIBELLE, DECIMALES, ZONE_EURO, COURS_FIXE) VALUES ('GBP', 'Livre', 2, 'N', 0)");
+  sql("INSERT INTO MONNAIE_COURS (IDENT, DTCOURS, COURS) VALUES ('GBP', '2024-03-01', 1.5), ('USD', '2024-03-01', 3)");
+  sql("UPDATE PARAM SET MONNAIE_IDENT = 'GBP'");
+  // A client invoice in dollars with one line of 0.25 without VAT.
+  auto enDollars = [&] {
+    return creer() && saisir("MIRVAE.MONNAIE_IDENT", "USD") && client() && ligne("758000", "0.25");
+  };
+  const struct {
+    const char* road;
+    std::function<std::string()> play;  // the amount that the road re-priced
+  } roads[] = {
+      {"copie d'une opération saisie à 1.5, au cours du jour 3",
+       [&] {
+         operationEnregistree("00000951");
+         sql("UPDATE MIRVAE SET MONNAIE_IDENT = 'USD', COURS = 1.5 WHERE IDENT = '00000951'");
+         sql("DELETE FROM MIRVAL WHERE IDENT = '00000951L1'");
+         sql("UPDATE MIRVAL SET HT = '0.25', TTC = '0.25' WHERE IDENT = '00000951L2'");
+         if (!ouvrirFiche("00000951", "VMCAv") || !appuyer("CREAT2")) return std::string("copie refusée");
+         return model::lignes(session())[0]["MIRVAL.HT"];
+       }},
+      {"bascule des dollars à 3 en livres à 1.5",
+       [&] {
+         user_.ajouterOui(true);
+         if (!enDollars() || !saisir("MIRVAE.MONNAIE_IDENT", "GBP")) return std::string("bascule refusée");
+         return model::lignes(session())[0]["MIRVAL.HT"];
+       }},
+      {"pièce en dollars à 3 valorisée en livres à 1.5",
+       [&] {
+         if (!enDollars() || !enregistrer("1")) return std::string("pièce refusée");
+         return sql("SELECT MTCRE FROM MOUVE WHERE NUMCP = '758000'");
+       }},
+  };
+  for (const auto& r : roads) {
+    SCOPED_TRACE(r.road);
+    EXPECT_EQ(r.play(), "0.13");
+    model::fermer(session());
+  }
 }
 
 TEST_F(DevisesTest, NoChangeInVisualisationNorWhileALineIsTyped) {

@@ -4,11 +4,11 @@
 
 #include <gtest/gtest.h>
 
+#include "host/counter.h"
 #include "host/error.h"
 #include "host/registry.h"
 #include "host/table.h"
 #include "model/mains.h"
-#include "model/numbering.h"
 #include "tests/support/fixture.h"
 
 namespace {
@@ -102,7 +102,7 @@ struct DocumentTest : model::Gestion_document2 {
       rejeter(e);
       return;
     }
-    if (L_IDENT.estVide()) L_IDENT = model::prochainIdentifiant(session().base(), "MIRVAL", 8);
+    if (L_IDENT.estVide()) L_IDENT = host::nextIdentifier(session().base(), "MIRVAL", 8);
     Gestion_document2::validation_ligne(e);
   }
   void validation(Evt* e) override {

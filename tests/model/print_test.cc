@@ -3,12 +3,12 @@
 
 #include <gtest/gtest.h>
 
+#include "host/counter.h"
 #include "host/error.h"
 #include "host/registry.h"
 #include "host/table.h"
 #include "model/impression.h"
 #include "model/interface.h"
-#include "model/numbering.h"
 #include "tests/support/fixture.h"
 
 namespace {
@@ -153,12 +153,17 @@ TEST_F(PrintTest, BadPrintRequestsFailTheActionAndSayWhy) {
 
 TEST_F(PrintTest, IdentifiersComeFromTheCountersInTurn) {
   session().action([&] {
-    EXPECT_EQ(model::prochainIdentifiant(base(), "MIRVAE", 8), "00000001");
-    EXPECT_EQ(model::prochainIdentifiant(base(), "MIRVAE", 8), "00000002");
-    EXPECT_EQ(model::prochainIdentifiant(base(), "NOUVEAU", 3), "001");
+    EXPECT_EQ(host::nextIdentifier(base(), "MIRVAE", 8), "00000001");
+    EXPECT_EQ(host::nextIdentifier(base(), "MIRVAE", 8), "00000002");
+    // A row the counter did not hand out (a dossier mended by hand): never handed out again.
+    base().exec("INSERT INTO MIRVAE (IDENT, TYPE, NUMCP) VALUES ('00000041', 'FC', '411001')");
+    EXPECT_EQ(host::nextIdentifier(base(), "MIRVAE", 8), "00000042");
+    EXPECT_EQ(host::nextIdentifier(base(), "NOUVEAU", 3), "001");
     base().exec("UPDATE NDOC SET DERNIER = 999 WHERE NOM = 'NOUVEAU'");
-    EXPECT_THROW(model::prochainIdentifiant(base(), "NOUVEAU", 3), HostError);
+    EXPECT_THROW(host::nextIdentifier(base(), "NOUVEAU", 3), HostError);
   });
+  // Outside a user action the number could not be given back.
+  EXPECT_THROW(host::nextIdentifier(base(), "MIRVAE", 8), HostError);
 }
 
 TEST_F(PrintTest, BindingsOfOneMemoryImageShareItsRows) {
