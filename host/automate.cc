@@ -205,10 +205,7 @@ void Automate::convertAmounts(const std::function<Decimal(const Decimal&)>& conv
 void Automate::keepState(Snapshot& snapshot) {
   for (Donnee* d : variables_) d->keepState(snapshot);
   for (Table* t : tables_) t->keepState(snapshot);
-  snapshot.keep(screen_);
-  snapshot.keep(error_code_);
-  snapshot.keep(refused_);
-  snapshot.keep(ended_);
+  snapshot.keep(screen_, error_code_, refused_, ended_);
 }
 
 void Automate::declarerVariable(Donnee* d) { variables_.push_back(d); }

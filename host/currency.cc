@@ -178,12 +178,7 @@ Devises& euro() {
 }
 
 void Devises::keepState(Snapshot& snapshot) {
-  snapshot.keep(current_);
-  snapshot.keep(current_rate_);
-  snapshot.keep(current_day_);
-  snapshot.keep(source_);
-  snapshot.keep(cible_);
-  snapshot.keep(typed_);
+  snapshot.keep(current_, current_rate_, current_day_, source_, cible_, typed_);
 }
 
 }  // namespace host

@@ -22,10 +22,10 @@ class Snapshot {
   Snapshot(Snapshot&&) = default;
   Snapshot& operator=(Snapshot&&) = default;
 
-  // Keeps a copy of `place`; restore() assigns it back.
-  template <class T>
-  void keep(T& place) {
-    restores_.emplace_back([&place, copy = place]() mutable { place = std::move(copy); });
+  // Keeps a copy of each place; restore() assigns them back.
+  template <class... T>
+  void keep(T&... places) {
+    (restores_.emplace_back([&places, copy = places]() mutable { places = std::move(copy); }), ...);
   }
   // Runs `restore` when the snapshot is restored.
   void add(std::function<void()> restore) { restores_.push_back(std::move(restore)); }

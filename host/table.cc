@@ -391,14 +391,9 @@ void Table::vide() {
 }
 
 void Table::keepState(Snapshot& snapshot) {
-  snapshot.keep(filters_);
-  snapshot.keep(active_);
-  snapshot.keep(request_text_);
+  snapshot.keep(filters_, active_, request_text_);
   if (db_) {
-    snapshot.keep(buffer_);
-    snapshot.keep(rowid_);
-    snapshot.keep(as_read_);
-    snapshot.keep(order_);
+    snapshot.keep(buffer_, rowid_, as_read_, order_);
     return;
   }
   // Opened during the action: what it read then belongs to the undone action.

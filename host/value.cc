@@ -388,8 +388,7 @@ Decimal Monnaie::valeurArrondie(const Decimal& value, int decimals, std::string_
 }
 
 void Donnee::keepState(Snapshot& snapshot) {
-  snapshot.keep(own_);
-  snapshot.keep(bound_);
+  snapshot.keep(own_, bound_);
 }
 
 }  // namespace host

@@ -96,13 +96,7 @@ void Scritere::fill() {
 
 void Scritere::keepState(host::Snapshot& snapshot) {
   Traitecr::keepState(snapshot);
-  snapshot.keep(out_of_date_);
-  snapshot.keep(alias_);
-  snapshot.keep(columns_);
-  snapshot.keep(variables_);
-  snapshot.keep(keyColumn_);
-  snapshot.keep(shown_);
-  snapshot.keep(selected_);
+  snapshot.keep(out_of_date_, alias_, columns_, variables_, keyColumn_, shown_, selected_);
 }
 
 void Scritere::checkRow(int n) const {

@@ -99,9 +99,7 @@ void Saisie::makeNew(Table& t) {
 
 void Saisie::keepState(host::Snapshot& snapshot) {
   AutomTab::keepState(snapshot);
-  snapshot.keep(saved_);
-  snapshot.keep(deletion_allowed_);
-  snapshot.keep(mode_);
+  snapshot.keep(saved_, deletion_allowed_, mode_);
 }
 
 void Saisie::applyVisuRequest() {

@@ -165,12 +165,7 @@ void Sdocum::clearLines() {
 
 void Sdocum::keepState(host::Snapshot& snapshot) {
   Setape::keepState(snapshot);
-  snapshot.keep(current_);
-  snapshot.keep(in_entry_);
-  snapshot.keep(in_list_);
-  snapshot.keep(line_stored_);
-  snapshot.keep(shown_variables_);
-  snapshot.keep(refused_control_);
+  snapshot.keep(current_, in_entry_, in_list_, line_stored_, shown_variables_, refused_control_);
 }
 
 void Sdocum::deleteLines(const std::string& ident) {

@@ -165,8 +165,7 @@ class PieceImport : public host::Automate {
 
   void keepState(host::Snapshot& snapshot) override {
     Automate::keepState(snapshot);
-    snapshot.keep(instance_);
-    snapshot.keep(errorCursor_);
+    snapshot.keep(instance_, errorCursor_);
   }
   // An instance that the user action leaves open (its caller stopped at a failure, or
   // its piece was refused) is given up with the action: its transfer rows go, and

@@ -8,10 +8,15 @@
 namespace testing_support {
 
 std::string cheminTemporaire(const std::string& stem) {
+  // Process numbers come round again: a name left by an earlier run is skipped, since
+  // a dossier is never made over an existing file.
   static std::atomic<int> counter{0};
-  return (std::filesystem::temp_directory_path() /
-          (stem + "-" + std::to_string(::getpid()) + "-" + std::to_string(counter++) + ".db"))
-      .string();
+  for (;;) {
+    std::string path = (std::filesystem::temp_directory_path() /
+                        (stem + "-" + std::to_string(::getpid()) + "-" + std::to_string(counter++) + ".db"))
+                           .string();
+    if (!std::filesystem::exists(path) && !std::filesystem::exists(path + "-wal")) return path;
+  }
 }
 
 std::vector<std::string> incoherences(host::Database& db) {
