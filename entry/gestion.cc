@@ -6,6 +6,7 @@
 #include "host/error.h"
 #include "host/session.h"
 #include "host/text.h"
+#include "model/child_rows.h"
 #include "model/interface.h"
 
 namespace entry {
@@ -476,42 +477,17 @@ void EntryScreen::suppression_donnees(Evt* e) {
   Sdocum::suppression_donnees(e);
 }
 
-// The analytic rows of a line are those whose NUMERO is the line's IDENT and "|";
-// the bar keeps a line without identifier from selecting every row.
 void EntryScreen::extraction_table_mirvaana(Evt*) {
-  std::string lien = MIRVAL_IDENT.chaine() + "|";
-  MIRVAANA_M01.initRequete();
-  MIRVAANA_M01.ajouteFiltre(MIRVAANA_M01_NUMERO, '/', lien);
-  MIRVAANA_M01.vide();
-  MIRVAANA.initRequete();
-  MIRVAANA.ajouteFiltre(MIRVAANA_NUMERO, '/', lien);
-  MIRVAANA.activeRequete();
-  for (int rc = MIRVAANA.suivant(3); rc == 0; rc = MIRVAANA.suivant(1)) {
-    MIRVAANA_M01.raz();
-    MIRVAANA_M01.copier(MIRVAANA);
-    MIRVAANA_M01.ecrit();
-  }
-  MIRVAANA.initRequete();
-  MIRVAANA_M01.initRequete();
+  model::removeChildRows(MIRVAANA_M01, MIRVAANA_M01_NUMERO, MIRVAL_IDENT.chaine());
+  model::copyChildRows(MIRVAANA, MIRVAANA_NUMERO, MIRVAANA_M01, MIRVAL_IDENT.chaine());
 }
 
 void EntryScreen::validation_table_mirvaana(Evt*) {
-  MIRVAANA_M01.initRequete();
-  MIRVAANA_M01.ajouteFiltre(MIRVAANA_M01_NUMERO, '/', MIRVAL_IDENT.chaine() + "|");
-  MIRVAANA_M01.activeRequete();
-  for (int rc = MIRVAANA_M01.suivant(3); rc == 0; rc = MIRVAANA_M01.suivant(1)) {
-    MIRVAANA.raz();
-    MIRVAANA.copier(MIRVAANA_M01);
-    MIRVAANA.ecrit();
-  }
-  MIRVAANA_M01.initRequete();
+  model::copyChildRows(MIRVAANA_M01, MIRVAANA_M01_NUMERO, MIRVAANA, MIRVAL_IDENT.chaine());
 }
 
 void EntryScreen::suppression_table_mirvaana(Evt*) {
-  MIRVAANA.initRequete();
-  MIRVAANA.ajouteFiltre(MIRVAANA_NUMERO, '/', MIRVAL_IDENT.chaine() + "|");
-  MIRVAANA.vide();
-  MIRVAANA.initRequete();
+  model::removeChildRows(MIRVAANA, MIRVAANA_NUMERO, MIRVAL_IDENT.chaine());
 }
 
 }  // namespace entry

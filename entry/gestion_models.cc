@@ -5,6 +5,7 @@
 
 #include "host/currency.h"
 #include "host/text.h"
+#include "model/child_rows.h"
 
 namespace entry {
 
@@ -182,22 +183,15 @@ void EntryScreen::copyAnalyticRows(const std::string& source,
                                    const std::function<Decimal(const Donnee&)>& atNewRate) {
   Decimal sourceNet, net;
   std::string last;
-  MIRVAANA2.initRequete();
-  MIRVAANA2.ajouteFiltre(MIRVAANA2_NUMERO, '/', source + "|");
-  MIRVAANA2.activeRequete();
-  for (int rc = MIRVAANA2.suivant(3); rc == 0; rc = MIRVAANA2.suivant(1)) {
-    MIRVAANA_M01.raz();
-    MIRVAANA_M01.copier(MIRVAANA2);
+  model::copyChildRows(MIRVAANA2, MIRVAANA2_NUMERO, MIRVAANA_M01, source, [&] {
     nouvelIdentifiant("MIRVAANA", MIRVAANA_M01_IDENT);
     MIRVAANA_M01_NUMERO = MIRVAL_IDENT.chaine() + "|";
     MIRVAANA_M01_MTADE = atNewRate(MIRVAANA2_MTADE);
     MIRVAANA_M01_MTACR = atNewRate(MIRVAANA2_MTACR);
-    MIRVAANA_M01.ecrit();
     sourceNet += MIRVAANA2_MTACR.decimal() - MIRVAANA2_MTADE.decimal();
     net += MIRVAANA_M01_MTACR.decimal() - MIRVAANA_M01_MTADE.decimal();
     last = MIRVAANA_M01_IDENT.chaine();
-  }
-  MIRVAANA2.initRequete();
+  });
   Decimal gap = MIRVAL_HT.decimal() - net;
   if (last.empty() || sourceNet != MIRVAL2_HT.decimal() || gap.isZero()) return;
   if (MIRVAANA_M01.lit(3, MIRVAANA_M01_IDENT, '=', last) != 0) return;

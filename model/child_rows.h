@@ -1,0 +1,25 @@
+// Rows that hang on a line of a document, as its analytic rows and its settlement
+// rows do: each row's NUMERO is the line's IDENT followed by "|" (the bar keeps a line
+// without identifier from selecting every row). While the document is entered they
+// live in the session's work table, once it is saved in the dossier's table; these
+// copy and remove them one line at a time, for every kind of child row alike.
+#pragma once
+
+#include <functional>
+#include <string>
+
+#include "host/table.h"
+
+namespace model {
+
+// Copies the rows of `line` from `from` (whose NUMERO field is `fromNumero`) into
+// `to`: each is blanked, filled from the source row by column name, handed to
+// `adjust` when there is one (the source row is still in `from`'s buffer), then
+// inserted. Both tables' requests are reset afterwards.
+void copyChildRows(host::Table& from, host::Champ& fromNumero, host::Table& to, const std::string& line,
+                   const std::function<void()>& adjust = nullptr);
+
+// Deletes the rows of `line` from `table`, without confirmation; its request is reset.
+void removeChildRows(host::Table& table, host::Champ& numero, const std::string& line);
+
+}  // namespace model
