@@ -157,10 +157,4 @@ const OperationKind& operationKind(int number) {
   throw host::HostError("type d'opération « " + std::to_string(number) + " » inconnu (1 à 6 attendu)");
 }
 
-const OperationKind& operationKindOfType(std::string_view type) {
-  for (const OperationKind& kind : kKinds)
-    if (kind.type == type) return kind;
-  throw host::HostError("type d'opération « " + std::string(type) + " » inconnu (FC, FF, NDF, BQ, CA ou OD attendu)");
-}
-
 }  // namespace registry

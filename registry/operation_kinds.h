@@ -8,7 +8,6 @@
 
 #include <array>
 #include <string>
-#include <string_view>
 
 namespace registry {
 
@@ -72,7 +71,5 @@ struct OperationKind {
 
 // The row of kind `number` (1 to 6); HostError for any other number.
 const OperationKind& operationKind(int number);
-// The row whose MIRVAE.TYPE is `type`; HostError for any other text.
-const OperationKind& operationKindOfType(std::string_view type);
 
 }  // namespace registry
