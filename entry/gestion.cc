@@ -1,5 +1,6 @@
 #include "entry/gestion.h"
 
+#include <algorithm>
 #include <vector>
 
 #include "host/currency.h"
@@ -17,6 +18,156 @@ constexpr const char* kCrLf = "\r\n";
 using host::text::kPiecePlaceholder;
 
 }  // namespace
+
+// ---------------------------------------------------------------------------- composition
+
+// The branches of the client invoice screen, in registration order. The other kinds
+// take theirs from it: those of the parts they lack left out, their own added.
+const std::vector<std::string_view> kInvoiceBranches = {
+    "INIT", "CTRL_DEFAUT_COLONNE", "CTRL_CUSTOM_COLONNE", "CTRL_CACHE_COLONNE ", "AVANT_DEBUT", "DEBUT",
+    "SELECTION_TRI", "COMMANDE1", "INFO_FICHE", "CONSTITUER_INFO_FICHE", "COMPLETER_INFO_FICHE", "IMPRIME",
+    "IMPR_FICHE", "MODIFICATION", "CREAT2", "DEBUT_VISUALISATION", "DEBUT_MODIFICATION", "DEBUT_CREATION",
+    "APRES_DEBUT_CREATION", "FIN_CREATION", "IMPORTATION_LIGNES", "DEBUT_FICHE", "V_CMODEL",
+    "V_CMODEL_CHOISIR", "MODTE_CHOISIR", "MODTE_GENERER", "DTOPE", "VLIBCP1", "COMPT1_CHOISIR",
+    "CONTROLER_COMPT", "NPIEC_ENTREE", "NPIEC", "PREFIXE_NUMERO_PIECE", "INPIE_ENTREE",
+    "PREFIXE_INTITULE_PIECE", "P1_SORTIE", "GRP1_SORTIE", "CONTROLER_P1", "CONTROLER_GRP1", "SELECTION",
+    "CTRL_DEBUT_LIGNE", "DEBUT_CREATION_LIGNE", "GESTION_ANALY_OUI_NON", "LST_ENTREE",
+    "INCREMENTE_NUMERO_PIECE", "V_SAISIE_COMPT2_FERME", "V_SAISIE_COMPT", "SAISIE_MTT", "LST_MIRVAL.NUMCP",
+    "LST_VLIBCP2", "COMPT2_CHOISIR", "LST_V_HT", "LST_MIRVAL.COTVA", "CDTVA_CHOISIR", "LST_MIRVAL.TVA",
+    "CALCUL_MTT_LIGNE", "CALCUL_TVA_SELON_HT", "CALCUL_TVA_SELON_TTC", "CALCUL_TTC", "CALCUL_HT",
+    "B_VALID_DOC", "VALID_DOC", "VALIDATION", "CONTROLER_LST", "APRES_VALIDATION", "AVANT_SUPPRESSION",
+    "B_ABAND_DOC", "VALIDATION_LIGNE", "APRES_VALIDATION_LIGNE", "APRES_SUPPRESSION_LIGNE", "BT_ANALYTIQUE",
+    "APPEL_ANALYTIQUE", "CALCUL_TOTAUX", "EXTRACTION_DONNEES", "EXTRACTION_TABLE_MIRVAANA",
+    "SUPPRESSION_DONNEES", "SUPPRESSION_TABLE_MIRVAANA", "VALIDATION_DONNEES", "VALIDATION_TABLE_MIRVAANA",
+    "CTRL_CHOISIR", "CTRL_OUVRE", "DIALOGUE", "MONNAIE_CHOISIR", "MONNAIE_IDENT", "COURS", "CTRL_BASCULER",
+    "CTRL_ACTUALISER_MODE", "CTRL_ACTUALISER_BASCULE", "ACTUALISER_INFO_MONETAIRES", "DEFINIR_BASCULE",
+    "MAJ_LIGNES_MEMOIRE",
+};
+
+
+std::vector<std::string_view> branchesWithout(std::vector<std::string_view> order,
+                                              std::initializer_list<std::string_view> left,
+                                              std::initializer_list<std::string_view> added) {
+  std::erase_if(order, [&](std::string_view name) { return std::find(left.begin(), left.end(), name) != left.end(); });
+  order.insert(order.end(), added.begin(), added.end());
+  return order;
+}
+
+void Handlers::add(std::string_view name, Automate::Handler handler) {
+  if (!handlers_.emplace(std::string(name), std::move(handler)).second)
+    throw HostError("la branche « " + std::string(name) + " » a deux traitements");
+}
+
+Automate::Handler Handlers::take(std::string_view name) {
+  auto found = handlers_.find(name);
+  if (found == handlers_.end()) return {};
+  Automate::Handler handler = std::move(found->second);
+  handlers_.erase(found);
+  return handler;
+}
+
+Part::Part(EntryScreen& screen) : s_(screen) { screen.parts_.push_back(this); }
+
+void EntryScreen::registerBranches(const std::vector<std::string_view>& order) {
+  Handlers handlers;
+  provide(handlers);
+  for (Part* part : parts_) part->provide(handlers);
+  for (std::string_view name : order) {
+    Automate::Handler handler = handlers.take(name);
+    if (!handler) throw HostError("la branche « " + std::string(name) + " » n'a pas de traitement, ou figure deux fois");
+    addBranch(std::string(name), std::move(handler));
+  }
+  if (!handlers.left().empty())
+    throw HostError("le traitement « " + handlers.left().begin()->first + " » n'est pas dans la table des branches");
+}
+
+void EntryScreen::provide(Handlers& handlers) {
+  handlers.add("INIT", this, &EntryScreen::init);
+  handlers.add("CTRL_DEFAUT_COLONNE", this, &EntryScreen::ctrl_defaut_colonne);
+  handlers.add("CTRL_CUSTOM_COLONNE", this, &EntryScreen::ctrl_custom_colonne);
+  handlers.add("CTRL_CACHE_COLONNE ", this, &EntryScreen::ctrl_cache_colonne);
+  handlers.add("AVANT_DEBUT", this, &EntryScreen::avant_debut);
+  handlers.add("DEBUT", this, &EntryScreen::debut);
+  handlers.add("SELECTION_TRI", this, &EntryScreen::selection_tri);
+  handlers.add("COMMANDE1", this, &EntryScreen::commande1);
+  handlers.add("INFO_FICHE", this, &EntryScreen::info_fiche);
+  handlers.add("CONSTITUER_INFO_FICHE", this, &EntryScreen::constituer_info_fiche);
+  handlers.add("COMPLETER_INFO_FICHE", this, &EntryScreen::completer_info_fiche);
+  handlers.add("IMPRIME", this, &EntryScreen::imprime);
+  handlers.add("IMPR_FICHE", this, &EntryScreen::impr_fiche);
+  handlers.add("MODIFICATION", this, &EntryScreen::modification);
+  handlers.add("CREAT2", this, &EntryScreen::creat2);
+  handlers.add("DEBUT_VISUALISATION", this, &EntryScreen::debut_visualisation);
+  handlers.add("DEBUT_MODIFICATION", this, &EntryScreen::debut_modification);
+  handlers.add("DEBUT_CREATION", this, &EntryScreen::debut_creation);
+  handlers.add("APRES_DEBUT_CREATION", this, &EntryScreen::apres_debut_creation);
+  handlers.add("FIN_CREATION", this, &EntryScreen::fin_creation);
+  handlers.add("IMPORTATION_LIGNES", this, &EntryScreen::importation_lignes);
+  handlers.add("DEBUT_FICHE", this, &EntryScreen::debut_fiche);
+  handlers.add("DTOPE", this, &EntryScreen::dtope);
+  handlers.add("CONTROLER_COMPT", this, &EntryScreen::controler_compt);
+  handlers.add("NPIEC_ENTREE", this, &EntryScreen::npiec_entree);
+  handlers.add("NPIEC", this, &EntryScreen::npiec);
+  handlers.add("PREFIXE_NUMERO_PIECE", this, &EntryScreen::prefixe_numero_piece);
+  handlers.add("INPIE_ENTREE", this, &EntryScreen::inpie_entree);
+  handlers.add("PREFIXE_INTITULE_PIECE", this, &EntryScreen::prefixe_intitule_piece);
+  handlers.add("P1_SORTIE", this, &EntryScreen::p1_sortie);
+  handlers.add("GRP1_SORTIE", this, &EntryScreen::grp1_sortie);
+  handlers.add("CONTROLER_P1", this, &EntryScreen::controler_p1);
+  handlers.add("CONTROLER_GRP1", this, &EntryScreen::controler_grp1);
+  handlers.add("SELECTION", this, &EntryScreen::selection);
+  handlers.add("CTRL_DEBUT_LIGNE", this, &EntryScreen::ctrl_debut_ligne);
+  handlers.add("DEBUT_CREATION_LIGNE", this, &EntryScreen::debut_creation_ligne);
+  handlers.add("GESTION_ANALY_OUI_NON", this, &EntryScreen::gestion_analy_oui_non);
+  handlers.add("LST_ENTREE", this, &EntryScreen::lst_entree);
+  handlers.add("INCREMENTE_NUMERO_PIECE", this, &EntryScreen::incremente_numero_piece);
+  handlers.add("V_SAISIE_COMPT2_FERME", this, &EntryScreen::v_saisie_compt2_ferme);
+  handlers.add("V_SAISIE_COMPT", this, &EntryScreen::v_saisie_compt);
+  handlers.add("SAISIE_MTT", this, &EntryScreen::saisie_mtt);
+  handlers.add("LST_MIRVAL.NUMCP", this, &EntryScreen::lst_mirval_numcp);
+  handlers.add("LST_VLIBCP2", this, &EntryScreen::lst_vlibcp2);
+  handlers.add("COMPT2_CHOISIR", this, &EntryScreen::compt2_choisir);
+  handlers.add("LST_V_HT", this, &EntryScreen::lst_v_ht);
+  handlers.add("LST_MIRVAL.COTVA", this, &EntryScreen::lst_mirval_cotva);
+  handlers.add("CDTVA_CHOISIR", this, &EntryScreen::cdtva_choisir);
+  handlers.add("LST_MIRVAL.TVA", this, &EntryScreen::lst_mirval_tva);
+  handlers.add("CALCUL_MTT_LIGNE", this, &EntryScreen::calcul_mtt_ligne);
+  handlers.add("CALCUL_TVA_SELON_HT", this, &EntryScreen::calcul_tva_selon_ht);
+  handlers.add("CALCUL_TVA_SELON_TTC", this, &EntryScreen::calcul_tva_selon_ttc);
+  handlers.add("CALCUL_TTC", this, &EntryScreen::calcul_ttc);
+  handlers.add("CALCUL_HT", this, &EntryScreen::calcul_ht);
+  handlers.add("B_VALID_DOC", this, &EntryScreen::b_valid_doc);
+  handlers.add("VALID_DOC", this, &EntryScreen::valid_doc);
+  handlers.add("VALIDATION", this, &EntryScreen::validation);
+  handlers.add("CONTROLER_LST", this, &EntryScreen::controler_lst);
+  handlers.add("APRES_VALIDATION", this, &EntryScreen::apres_validation);
+  handlers.add("AVANT_SUPPRESSION", this, &EntryScreen::avant_suppression);
+  handlers.add("B_ABAND_DOC", this, &EntryScreen::b_aband_doc);
+  handlers.add("VALIDATION_LIGNE", this, &EntryScreen::validation_ligne);
+  handlers.add("APRES_VALIDATION_LIGNE", this, &EntryScreen::apres_validation_ligne);
+  handlers.add("APRES_SUPPRESSION_LIGNE", this, &EntryScreen::apres_suppression_ligne);
+  handlers.add("BT_ANALYTIQUE", this, &EntryScreen::bt_analytique);
+  handlers.add("APPEL_ANALYTIQUE", this, &EntryScreen::appel_analytique);
+  handlers.add("CALCUL_TOTAUX", this, &EntryScreen::calcul_totaux);
+  handlers.add("EXTRACTION_DONNEES", this, &EntryScreen::extraction_donnees);
+  handlers.add("EXTRACTION_TABLE_MIRVAANA", this, &EntryScreen::extraction_table_mirvaana);
+  handlers.add("SUPPRESSION_DONNEES", this, &EntryScreen::suppression_donnees);
+  handlers.add("SUPPRESSION_TABLE_MIRVAANA", this, &EntryScreen::suppression_table_mirvaana);
+  handlers.add("VALIDATION_DONNEES", this, &EntryScreen::validation_donnees);
+  handlers.add("VALIDATION_TABLE_MIRVAANA", this, &EntryScreen::validation_table_mirvaana);
+  handlers.add("CTRL_CHOISIR", this, &EntryScreen::ctrl_choisir);
+  handlers.add("CTRL_OUVRE", this, &EntryScreen::ctrl_ouvre);
+  handlers.add("DIALOGUE", this, &EntryScreen::dialogue);
+  handlers.add("MONNAIE_CHOISIR", this, &EntryScreen::monnaie_choisir);
+  handlers.add("MONNAIE_IDENT", this, &EntryScreen::monnaie_ident);
+  handlers.add("COURS", this, &EntryScreen::cours);
+  handlers.add("CTRL_BASCULER", this, &EntryScreen::ctrl_basculer);
+  handlers.add("CTRL_ACTUALISER_MODE", this, &EntryScreen::ctrl_actualiser_mode);
+  handlers.add("CTRL_ACTUALISER_BASCULE", this, &EntryScreen::ctrl_actualiser_bascule);
+  handlers.add("ACTUALISER_INFO_MONETAIRES", this, &EntryScreen::actualiser_info_monetaires);
+  handlers.add("DEFINIR_BASCULE", this, &EntryScreen::definir_bascule);
+  handlers.add("MAJ_LIGNES_MEMOIRE", this, &EntryScreen::maj_lignes_memoire);
+}
 
 EntryScreen::EntryScreen(Evt* e, const registry::OperationKind& kind) : Gestion_document2(e), kind_(kind) {
   Evt* launch = lancement();
@@ -77,9 +228,16 @@ void EntryScreen::readCreationJournal() {
       if (JONAL.suivant(3) != 0) JONAL.raz();
       return;
     case registry::CreationJournal::OfFirstTreasury: {
-      // The header accounts' selection holds the kind's treasury accounts.
+      // The first of the kind's treasury accounts, by number.
       Champ cptre("CPTRE", &JONAL);
-      if (COMPT1.suivant(3) != 0 || JONAL.lit(3, cptre, '=', COMPT1_NUMCP) != 0) JONAL.raz();
+      COMPT.initRequete();
+      COMPT.ajouteFiltre(COMPT_NATUC, '?', kind_.headerNature);
+      COMPT.ajouteFiltre(COMPT_CCTRA, '#', "O");
+      COMPT.choisitIndex("NUMCP");
+      COMPT.activeRequete();
+      bool found = COMPT.suivant(3) == 0 && JONAL.lit(3, cptre, '=', COMPT_NUMCP) == 0;
+      COMPT.initRequete();
+      if (!found) JONAL.raz();
       return;
     }
   }
@@ -170,12 +328,6 @@ void EntryScreen::debut(Evt* e) {
     messageOk(kind_.noJournal);
   }
 
-  COMPT1.initRequete();
-  COMPT1.ajouteFiltre(COMPT1_NATUC, '?', kind_.headerNature);
-  COMPT1.ajouteFiltre(COMPT1_CCTRA, '#', "O");
-  COMPT1.choisitIndex("LIBCP");
-  COMPT1.activeRequete();
-
   COMPT2.initRequete();
   COMPT2.ajouteFiltre(COMPT2_NATUC, '?', kind_.lineNature);
   COMPT2.ajouteFiltre(COMPT2_CCTRA, '#', "O");
@@ -188,6 +340,7 @@ void EntryScreen::debut(Evt* e) {
   CDTVA.activeRequete();
 
   ecran()->commande(1, "Infos fiche");
+  for (Part* part : parts_) part->started();
 }
 
 void EntryScreen::selection_tri(Evt* e) {
@@ -270,9 +423,9 @@ void EntryScreen::debut_visualisation(Evt* e) { Saisie::debut_visualisation(e); 
 
 void EntryScreen::debut_modification(Evt* e) {
   Saisie::debut_modification(e);
-  V_CMODEL = "";
   // A saved operation keeps its journal: its piece was numbered there.
-  ecran()->interdit("V_CMODEL", "MODTE_CHOISIR", "NUMJL", "");
+  ecran()->interdit("NUMJL", "");
+  for (Part* part : parts_) part->modificationStarted();
 }
 
 void EntryScreen::debut_creation(Evt* e) {
@@ -301,15 +454,15 @@ void EntryScreen::debut_creation(Evt* e) {
   }
   MIRVAE_COURS = euro().cours(MIRVAE_MONNAIE_IDENT.chaine(), MIRVAE_DTOPE.jour());
 
-  if (kind_.models) ecran()->autorise("V_CMODEL", "MODTE_CHOISIR", "");
   MIRVAE_SAISIE_MTT = kind_.amountTyped;
   procedure("SAISIE_MTT");
+  for (Part* part : parts_) part->creationStarted();
 }
 
 void EntryScreen::apres_debut_creation(Evt* e) {
   Sdocum::apres_debut_creation(e);
   if (!IDENT_ORIGINE.estVide()) procedure("IMPORTATION_LIGNES");
-  if (!V_CMODEL.estVide()) procedure("MODTE_GENERER");
+  for (Part* part : parts_) part->creationShown();
 }
 
 void EntryScreen::fin_creation(Evt* e) {
@@ -322,8 +475,6 @@ void EntryScreen::fin_creation(Evt* e) {
   if (V_CREAT_ACTIF == 1) {
     V_CREAT_ACTIF = 0;
     enFile("CREATION");
-  } else {
-    V_CMODEL = "";
   }
 }
 
@@ -340,10 +491,7 @@ void EntryScreen::dialogue(Evt* e) {
 
 void EntryScreen::debut_fiche(Evt* e) {
   Gestion_document2::debut_fiche(e);
-  if (!lireOuVider(COMPT1, COMPT1_NUMCP, MIRVAE_NUMCP))
-    VLIBCP1 = enCreation() ? std::string() : kind_.headerUnknownOpen + MIRVAE_NUMCP.chaine() + "> inexistant !";
-  else
-    VLIBCP1 = COMPT1_LIBCP;
+  for (Part* part : parts_) part->opened();
   lireJournal();
   procedure("SAISIE_MTT");
   lireOuVider(PIECE, PIECE_NPIES, MIRVAE_NPIES);
@@ -377,12 +525,10 @@ void EntryScreen::validation(Evt* e) {
     if (V_CHOIX == "1") {
       V_CREAT_ACTIF = 0;
       V_IMPR_FICHE = 0;
-      V_CMODEL = "";
     } else if (V_CHOIX == "2") {
       V_CREAT_ACTIF = 1;
       V_IMPR_FICHE = 0;
     } else if (V_CHOIX == "3") {
-      V_CMODEL = "";
       V_CREAT_ACTIF = 0;
       V_IMPR_FICHE = 1;
     } else {
@@ -390,6 +536,7 @@ void EntryScreen::validation(Evt* e) {
       rejeter(e);
       return;
     }
+    for (Part* part : parts_) part->choiceMade(V_CHOIX.chaine());
   }
   // Each check shows its message and puts the focus on the faulty control itself.
   for (const char* check : {"CONTROLER_P1", "CONTROLER_GRP1", "CONTROLER_LST"}) {

@@ -3,9 +3,13 @@
 // line, the piece numbering of its journal, the checks before saving, and the
 // posting to the ledger after each save.
 //
-// The kind's constants and texts come from its row of the operation-kind table (registry/operation_kinds.h); each
-// registered class ("MIRVAE-GESTION1" ...) is this screen built with its row, plus
-// its own branch table and the few handlers its kind adds.
+// The screen is a core, which declares and handles what the six kinds share, and
+// parts (entry/parts.h) that some kinds have: the header account, the entry models.
+// Each registered class ("MIRVAE-GESTION1" ...) names its row of the operation-kind
+// table (registry/operation_kinds.h), holds its parts, registers the core's and its
+// parts' branches in its own order, and gives the few rules its kind changes.
+// The screen's variables, tables and fields are public: the host and the parts
+// address them as the screen's own.
 //
 // What the screen relies on:
 //   - the dossier's parameters row (PARAM, PNUME 1), read at start; without it the
@@ -23,7 +27,10 @@
 #pragma once
 
 #include <functional>
+#include <map>
 #include <string>
+#include <string_view>
+#include <vector>
 
 #include "registry/operation_kinds.h"
 #include "host/table.h"
@@ -33,6 +40,64 @@ namespace entry {
 
 using namespace host;
 
+class EntryScreen;
+
+// The branch table of the client invoice screen, in registration order.
+extern const std::vector<std::string_view> kInvoiceBranches;
+// `order` without the branches `left`, then `added`.
+std::vector<std::string_view> branchesWithout(std::vector<std::string_view> order,
+                                              std::initializer_list<std::string_view> left,
+                                              std::initializer_list<std::string_view> added = {});
+
+// The handlers a screen's core and parts offer, by branch name.
+class Handlers {
+ public:
+  void add(std::string_view name, Automate::Handler handler);
+  // A member of `owner` (the screen or one of its parts).
+  template <class T>
+  void add(std::string_view name, T* owner, void (T::*member)(Evt*)) {
+    add(name, [owner, member](Evt* e) { (owner->*member)(e); });
+  }
+  // Takes the handler of `name` out; an empty handler when none is offered.
+  Automate::Handler take(std::string_view name);
+  const std::map<std::string, Automate::Handler, std::less<>>& left() const { return handlers_; }
+
+ private:
+  std::map<std::string, Automate::Handler, std::less<>> handlers_;
+};
+
+// A part of an entry screen that some kinds have: its declarations (made on the
+// screen, after the core's), its handlers, and what it adds at the moments of the
+// screen that the core names. A part registers itself with the screen it is made on.
+class Part {
+ public:
+  explicit Part(EntryScreen& screen);
+  Part(const Part&) = delete;
+  Part& operator=(const Part&) = delete;
+  virtual ~Part() = default;
+
+  virtual void provide(Handlers& handlers) = 0;
+  // The end of "DEBUT": the dossier's options are known.
+  virtual void started() {}
+  // A new operation has its defaults ("DEBUT_CREATION"), then is shown ("APRES_DEBUT_CREATION").
+  virtual void creationStarted() {}
+  virtual void creationShown() {}
+  virtual void modificationStarted() {}
+  // An operation was read ("DEBUT_FICHE").
+  virtual void opened() {}
+  // The answer of the validation dialog of a creation.
+  virtual void choiceMade(const std::string& /*choice*/) {}
+  // The header checks of "CONTROLER_GRP1": false once `e` is refused.
+  virtual bool headerAccepted(Evt* /*e*/) { return true; }
+  // Opens the choice window of `control` ("CTRL_CHOISIR"): false when not its own.
+  virtual bool chooses(const std::string& /*control*/) { return false; }
+  // Takes the account of an entry model's line as its own: false when it does not.
+  virtual bool takesModelAccount(const std::string& /*account*/) { return false; }
+
+ protected:
+  EntryScreen& s_;
+};
+
 class EntryScreen : public model::Gestion_document2 {
  public:
   // Declares the variables, tables and fields, reads the launch parameters
@@ -41,6 +106,15 @@ class EntryScreen : public model::Gestion_document2 {
   EntryScreen(Evt* e, const registry::OperationKind& kind);
 
   const registry::OperationKind& kind() const { return kind_; }
+
+  // Registers the core's and the parts' handlers in `order`; each offered handler
+  // must be named once, and every name must have its handler.
+  void registerBranches(const std::vector<std::string_view>& order);
+  // The side on which a line's amount stands in the ledger: debit for expenses,
+  // credit for revenue. The analytic rows of the line stand on the same side.
+  virtual bool lineOnDebit() = 0;
+  // The core's own handlers.
+  virtual void provide(Handlers& handlers);
 
   // ---- start, record, modes (lifecycle)
   void init(Evt* e) override;
@@ -78,17 +152,11 @@ class EntryScreen : public model::Gestion_document2 {
   void validation_table_mirvaana(Evt* e);
   void dialogue(Evt* e) override;
 
-  // ---- entry models and line import (gestion_models.cc)
+  // ---- import of a duplicated operation (gestion_models.cc)
   void importation_lignes(Evt* e);
-  void v_cmodel(Evt* e);
-  void v_cmodel_choisir(Evt* e);
-  void modte_choisir(Evt* e);
-  void modte_generer(Evt* e);
 
   // ---- header checks (gestion_checks.cc)
   void dtope(Evt* e);
-  void vlibcp1(Evt* e);
-  void compt1_choisir(Evt* e);
   void controler_compt(Evt* e);
   void p1_sortie(Evt* e);
   void grp1_sortie(Evt* e);
@@ -148,7 +216,6 @@ class EntryScreen : public model::Gestion_document2 {
   // those lines that wait in the work table to be saved with them.
   void convertAmounts(const std::function<Decimal(const Decimal&)>& convert) override;
 
- protected:
   // ---- helpers shared by the handlers
   // Runs one of the screen's own branches at once.
   void procedure(const char* name, Evt* e = nullptr);
@@ -194,22 +261,18 @@ class EntryScreen : public model::Gestion_document2 {
   void switchCurrency(const char* options);
   // Whether the document has lines in memory.
   bool hasLines();
-  // Adds a line of the current model line (MODLI) on the account read into COMPT2.
-  void addModelLine();
   // Copies the analytic rows of source line `source` to the line in MIRVAL, each
   // amount through `atNewRate`.
   void copyAnalyticRows(const std::string& source, const std::function<Decimal(const Donnee&)>& atNewRate);
 
   const registry::OperationKind& kind_;
+  std::vector<Part*> parts_;  // in the order they were made
 
   // ---- launch parameters
   Chaine PIDENT{"PIDENT", "", "", 0, this};
   Chaine PMODE{"PMODE", "", "", 0, this};
 
   // ---- variables
-  Chaine V_CMODEL{"V_CMODEL", "", "!(11)", 0, this};
-  Chaine VNUMCP1{"VNUMCP1", "", "", 0, this};
-  Chaine VLIBCP1{"VLIBCP1", "", "", 0, this};
   Chaine V_SAISIE_COMPT{"V_SAISIE_COMPT", "", "", 0, this};
   Chaine V_SAISIE_COMPT2{"V_SAISIE_COMPT2", "", "", 0, this};
   Chaine V_SAISIE_MTT{"V_SAISIE_MTT", "", "", 0, this};
@@ -249,7 +312,6 @@ class EntryScreen : public model::Gestion_document2 {
   // ---- tables (the main table MIRVAE is the automaton's own)
   Table MIRVAL{this, "", "MIRVAL", ""};
   Table MEM_MIRVAL{this, "", "MEM:MIRVAL", "MEM_MIRVAL"};
-  Table COMPT1{this, "", "COMPT", "COMPT1"};
   Table COMPT2{this, "", "COMPT", "COMPT2"};
   Table MIRVAL2{this, "", "MIRVAL", "MIRVAL2"};
   Table MIRVAANA2{this, "", "MIRVAANA", "MIRVAANA2"};
@@ -258,8 +320,6 @@ class EntryScreen : public model::Gestion_document2 {
   Table CDTVA{this, "", "CDTVA", ""};
   Table MIRVAANA_M01{this, "", "MIRVAANA_M01", ""};
   Table PIECE{this, "", "PIECE", ""};
-  Table MODTE{this, "", "MODTE", ""};
-  Table MODLI{this, "", "MODLI", ""};
   Table COMPT{this, "", "COMPT", ""};
   Table MIRVAL_M01{this, "", "MIRVAL_M01", ""};
   Table MIRVAANA{this, "", "MIRVAANA", ""};
@@ -317,10 +377,6 @@ class EntryScreen : public model::Gestion_document2 {
   Champ MIRVAANA_M01_NUMERO{"NUMERO", &MIRVAANA_M01};
   Champ MIRVAANA_M01_MTADE{"MTADE", &MIRVAANA_M01};
   Champ MIRVAANA_M01_MTACR{"MTACR", &MIRVAANA_M01};
-  Champ COMPT1_NUMCP{"NUMCP", &COMPT1};
-  Champ COMPT1_LIBCP{"LIBCP", &COMPT1};
-  Champ COMPT1_NATUC{"NATUC", &COMPT1};
-  Champ COMPT1_CCTRA{"CCTRA", &COMPT1};
   Champ COMPT2_NUMCP{"NUMCP", &COMPT2};
   Champ COMPT2_LIBCP{"LIBCP", &COMPT2};
   Champ COMPT2_NATUC{"NATUC", &COMPT2};
@@ -336,10 +392,6 @@ class EntryScreen : public model::Gestion_document2 {
   Champ COMPT_SAANA{"SAANA", &COMPT};
   Champ PIECE_NPIES{"NPIES", &PIECE};
   Champ PIECE_IMPUT{"IMPUT", &PIECE};
-  Champ MODTE_CODE{"CODE", &MODTE};
-  Champ MODTE_NUMJL{"NUMJL", &MODTE};
-  Champ MODTE_NPIEC{"NPIEC", &MODTE};
-  Champ MODTE_INPIE{"INPIE", &MODTE};
   Champ PARAM_PNUME{"PNUME", &PARAM};
   Champ PARAM_MONNAIE_IDENT{"MONNAIE_IDENT", &PARAM};
   Champ PARAM_MONNAIE_CMP_IDENT{"MONNAIE_CMP_IDENT", &PARAM};
@@ -355,18 +407,7 @@ class EntryScreen : public model::Gestion_document2 {
   Champ JONAL_RAZPI{"RAZPI", &JONAL};
   Champ CDTVA_COTVA{"COTVA", &CDTVA};
   Champ CDTVA_TYTVA{"TYTVA", &CDTVA};
-  Champ MODLI_NLIGNE{"NLIGNE", &MODLI};
-  Champ MODLI_COL_NUMCP{"COL_NUMCP", &MODLI};
-  Champ MODLI_COL_LIBEC{"COL_LIBEC", &MODLI};
-  Champ MODLI_COL_COTVA{"COL_COTVA", &MODLI};
   Champ I_MONNAIE_IDENT{"IDENT", &I_MONNAIE};
-};
-
-// One entry of a screen's branch table: an event or procedure name and its handler.
-// A handler that overrides a model event is reached through its virtual call.
-struct Branche {
-  const char* event;
-  void (EntryScreen::*handler)(Evt*);
 };
 
 }  // namespace entry

@@ -13,33 +13,6 @@ void EntryScreen::dtope(Evt* e) {
   ecran()->affiche("DTECH", "");
 }
 
-void EntryScreen::vlibcp1(Evt* e) {
-  if (VLIBCP1.estVide()) {
-    MIRVAE_NUMCP = "";
-    ecran()->affiche("VLIBCP1", "");
-    return;
-  }
-  if (COMPT1.lit(3, COMPT1_LIBCP, '=', VLIBCP1) != 0) return refuser(e, kind_.headerMissing, "VLIBCP1");
-  EvtParamVal controle(3, "LIBCP", &VLIBCP1, kind_.headerNature);
-  procedure("CONTROLER_COMPT", &controle);
-  if (erreurMethode() != 0) {
-    controler("VLIBCP1");
-    rejeter(e);
-    return;
-  }
-  MIRVAE_NUMCP = COMPT_NUMCP;
-}
-
-void EntryScreen::compt1_choisir(Evt*) {
-  if (enVisualisation()) {
-    messageOk("Opération interdite en mode visualisation !");
-    return;
-  }
-  EvtParamRef choix(5, &VLIBCP1, &COMPT1_LIBCP, kind_.headerNature, "LIBCP", "N");
-  appelerProcedure("*", "CPCOMPT", "INTERFACE", "CHOIX_INTITULE_REDUIT", &choix, -1);
-  enFile("VLIBCP1");
-}
-
 void EntryScreen::controler_compt(Evt* e) {
   Chaine P_1("P_1", "", "", 4, this), P_2("P_2", "", "", 4, this), P_3("P_3", "", "", 4, this);
   e->param(0, P_1, 0);
@@ -104,7 +77,8 @@ void EntryScreen::controler_p1(Evt* e) {
 
 void EntryScreen::controler_grp1(Evt* e) {
   erreurMethode(1, e);
-  if (MIRVAE_NUMCP.estVide()) return refuser(e, kind_.headerRequired, "VLIBCP1");
+  for (Part* part : parts_)
+    if (!part->headerAccepted(e)) return;
   if (MIRVAE_INPIE.estVide()) return refuser(e, "La saisie d'un libellé de pièce est obligatoire !", "INPIE");
   erreurMethode(0, e);
 }

@@ -193,10 +193,9 @@ void EntryScreen::ctrl_ouvre(Evt* e) {
 
 void EntryScreen::ctrl_choisir(Evt* e) {
   std::string control = e->nbParams() > 0 ? e->parametre(0).chaine() : std::string();
-  if (control == "VLIBCP1")
-    procedure("COMPT1_CHOISIR");
-  else
-    Gestion_document2::ctrl_choisir(e);
+  for (Part* part : parts_)
+    if (part->chooses(control)) return;
+  Gestion_document2::ctrl_choisir(e);
 }
 
 // ---------------------------------------------------------------------------- VAT code of the line
@@ -373,15 +372,13 @@ void EntryScreen::appel_analytique(Evt*) {
 
   Monnaie V_MTDEB("V_MTDEB", "", "", 4, this), V_MTCRE("V_MTCRE", "", "", 4, this);
   Entier V_SIGNE("V_SIGNE", "", "", 4, this);
-  if (MIRVAL_HT < 0) {
-    V_MTDEB = -MIRVAL_HT.decimal();
-    V_MTCRE = 0;
-    V_SIGNE = -1;
-  } else {
-    V_MTDEB = 0;
-    V_MTCRE = MIRVAL_HT;
-    V_SIGNE = 1;
-  }
+  // The rows stand on the side of the line's movement: a negative amount, on the other.
+  bool negative = MIRVAL_HT < 0;
+  Decimal amount = negative ? -MIRVAL_HT.decimal() : MIRVAL_HT.decimal();
+  bool debit = lineOnDebit() != negative;
+  V_MTDEB = debit ? amount : Decimal();
+  V_MTCRE = debit ? Decimal() : amount;
+  V_SIGNE = negative ? -1 : 1;
 
   MIRVAL_M01.initRequete();
   MIRVAL_M01.vide();

@@ -1,7 +1,7 @@
 // Prefilling a new operation: from an entry model of the accounting application
 // (MODTE, MODLI) chosen by its code, or from the operation being duplicated, whose
 // lines and analytic rows are copied at the new rate.
-#include "entry/gestion.h"
+#include "entry/parts.h"
 
 #include "host/currency.h"
 #include "host/text.h"
@@ -37,37 +37,63 @@ bool EntryScreen::readAccountOfNature(Table& t, Champ& numcp, Champ& natuc, Cham
 
 // ---------------------------------------------------------------------------- entry models
 
-void EntryScreen::v_cmodel_choisir(Evt*) { procedure("MODTE_CHOISIR"); }
+EntryModels::EntryModels(EntryScreen& screen) : Part(screen) {}
 
-void EntryScreen::modte_choisir(Evt*) {
-  Entier V_CHOIX_MODELE("V_CHOIX_MODELE", "Rend le choix effectué dans l'objet Choix du modèle", "", 4, this);
+void EntryModels::provide(Handlers& handlers) {
+  handlers.add("V_CMODEL", this, &EntryModels::v_cmodel);
+  handlers.add("V_CMODEL_CHOISIR", this, &EntryModels::v_cmodel_choisir);
+  handlers.add("MODTE_CHOISIR", this, &EntryModels::modte_choisir);
+  handlers.add("MODTE_GENERER", this, &EntryModels::modte_generer);
+}
+
+void EntryModels::creationStarted() { s_.ecran()->autorise("V_CMODEL", "MODTE_CHOISIR", ""); }
+
+void EntryModels::creationShown() {
+  if (!V_CMODEL.estVide()) s_.procedure("MODTE_GENERER");
+}
+
+void EntryModels::modificationStarted() {
+  V_CMODEL = "";
+  s_.ecran()->interdit("V_CMODEL", "MODTE_CHOISIR", "");
+}
+
+// Only a new piece created right after this one keeps its model.
+void EntryModels::choiceMade(const std::string& choice) {
+  if (choice != "2") V_CMODEL = "";
+}
+
+void EntryModels::v_cmodel_choisir(Evt*) { s_.procedure("MODTE_CHOISIR"); }
+
+void EntryModels::modte_choisir(Evt*) {
+  Entier V_CHOIX_MODELE("V_CHOIX_MODELE", "Rend le choix effectué dans l'objet Choix du modèle", "", 4, &s_);
   Chaine dossier(Univers::dossier());
-  lireJournal();
-  EvtParamRef choix(4, &V_CHOIX_MODELE, &V_CMODEL, &dossier, &JONAL_NUMJL);
-  appelerModule("", "COMPTA", "CHOIX_MODELE_ECRITURES", &choix);
-  ecran()->affiche("V_CMODEL", "");
-  enFile("V_CMODEL");
+  s_.lireJournal();
+  EvtParamRef choix(4, &V_CHOIX_MODELE, &V_CMODEL, &dossier, &s_.JONAL_NUMJL);
+  s_.appelerModule("", "COMPTA", "CHOIX_MODELE_ECRITURES", &choix);
+  s_.ecran()->affiche("V_CMODEL", "");
+  s_.enFile("V_CMODEL");
 }
 
-void EntryScreen::v_cmodel(Evt* e) {
+void EntryModels::v_cmodel(Evt* e) {
   if (V_CMODEL.estVide()) return;
-  if (MODTE.lit(3, MODTE_CODE, '=', V_CMODEL) != 0) return refuser(e, libelle("0415"), "V_CMODEL");
-  if (MODTE_NUMJL != MIRVAE_NUMJL)
-    return refuser(e, "Le modèle doit être associé au n° journal <" + MIRVAE_NUMJL.chaine() + "> !", "V_CMODEL");
-  procedure("MODTE_GENERER");
+  if (MODTE.lit(3, MODTE_CODE, '=', V_CMODEL) != 0) return s_.refuser(e, s_.libelle("0415"), "V_CMODEL");
+  if (MODTE_NUMJL != s_.MIRVAE_NUMJL)
+    return s_.refuser(e, "Le modèle doit être associé au n° journal <" + s_.MIRVAE_NUMJL.chaine() + "> !",
+                      "V_CMODEL");
+  s_.procedure("MODTE_GENERER");
 }
 
-void EntryScreen::modte_generer(Evt*) {
+void EntryModels::modte_generer(Evt*) {
   // A new creation that keeps the model of the previous one comes here without
   // "V_CMODEL": the model is read again rather than trusted to be in the buffer.
   if (V_CMODEL.estVide() || MODTE.lit(3, MODTE_CODE, '=', V_CMODEL) != 0) return;
 
-  enFile("APRES_ABANDON_LIGNE");
-  MEM_MIRVAL.initRequete();
-  MEM_MIRVAL.vide();
+  s_.enFile("APRES_ABANDON_LIGNE");
+  s_.MEM_MIRVAL.initRequete();
+  s_.MEM_MIRVAL.vide();
 
-  if (!MODTE_NPIEC.estVide()) MIRVAE_NPIEC = MODTE_NPIEC;
-  MIRVAE_INPIE = MODTE_INPIE;
+  if (!MODTE_NPIEC.estVide()) s_.MIRVAE_NPIEC = MODTE_NPIEC;
+  s_.MIRVAE_INPIE = MODTE_INPIE;
 
   std::string code = V_CMODEL.chaine();
   code.resize(kModelCodeWidth, ' ');
@@ -77,56 +103,55 @@ void EntryScreen::modte_generer(Evt*) {
   MODLI.activeRequete();
   for (int rc = MODLI.suivant(3); rc == 0; rc = MODLI.suivant(1)) {
     if (madeByPosting(MODLI_COL_NUMCP)) continue;
-    // A read by key ignores a binding's request: whether the account is one the
-    // header or the lines may take is asked of the dossier with the lists' filters.
-    if (*kind_.headerNature && readAccountOfNature(COMPT1, COMPT1_NUMCP, COMPT1_NATUC, COMPT1_CCTRA,
-                                                  MODLI_COL_NUMCP.chaine(), kind_.headerNature)) {
-      MIRVAE_NUMCP = COMPT1_NUMCP;
-      VLIBCP1 = COMPT1_LIBCP;
-      continue;
-    }
+    std::string account = MODLI_COL_NUMCP.chaine();
+    bool taken = false;
+    for (Part* part : s_.parts_) taken = taken || part->takesModelAccount(account);
+    if (taken) continue;
     // An account root takes the first account that begins with it.
-    COMPT.initRequete();
-    COMPT.ajouteFiltre(COMPT_NUMCP, '/', MODLI_COL_NUMCP);
-    COMPT.choisitIndex("NUMCP");
-    COMPT.activeRequete();
-    bool found = COMPT.suivant(3) == 0;
-    COMPT.initRequete();
+    Table& compt = s_.COMPT;
+    compt.initRequete();
+    compt.ajouteFiltre(s_.COMPT_NUMCP, '/', account);
+    compt.choisitIndex("NUMCP");
+    compt.activeRequete();
+    bool found = compt.suivant(3) == 0;
+    compt.initRequete();
     if (!found) continue;
-    if (!readAccountOfNature(COMPT2, COMPT2_NUMCP, COMPT2_NATUC, COMPT2_CCTRA, COMPT_NUMCP.chaine(), kind_.lineNature))
+    if (!EntryScreen::readAccountOfNature(s_.COMPT2, s_.COMPT2_NUMCP, s_.COMPT2_NATUC, s_.COMPT2_CCTRA,
+                                          s_.COMPT_NUMCP.chaine(), s_.kind().lineNature))
       continue;
     addModelLine();
   }
   MODLI.initRequete();
 
-  procedure("RENUMEROTE_LIGNES");
+  s_.procedure("RENUMEROTE_LIGNES");
   // The lines replaced carried amounts: the totals must not keep them.
-  procedure("CALCUL_TOTAUX");
-  ecran()->affiche("GRP1", "LST", "");
-  ecran()->fonction(16, "LST");
+  s_.procedure("CALCUL_TOTAUX");
+  s_.ecran()->affiche("GRP1", "LST", "");
+  s_.ecran()->fonction(16, "LST");
 }
 
 // A line of the model on the account in COMPT2. Amounts stay empty: the user types them.
-void EntryScreen::addModelLine() {
-  MIRVAL.raz();
-  nouvelIdentifiant("MIRVAL", MIRVAL_IDENT);
-  MIRVAL_NUMERO = MIRVAE_IDENT.chaine() + "|";
-  MIRVAL_NUMCP = COMPT2_NUMCP;
-  MIRVAL_LIBEC = MODLI_COL_LIBEC.estVide() ? MIRVAE_INPIE.chaine() : MODLI_COL_LIBEC.chaine();
+void EntryModels::addModelLine() {
+  EntryScreen& s = s_;
+  s.MIRVAL.raz();
+  s.nouvelIdentifiant("MIRVAL", s.MIRVAL_IDENT);
+  s.MIRVAL_NUMERO = s.MIRVAE_IDENT.chaine() + "|";
+  s.MIRVAL_NUMCP = s.COMPT2_NUMCP;
+  s.MIRVAL_LIBEC = MODLI_COL_LIBEC.estVide() ? s.MIRVAE_INPIE.chaine() : MODLI_COL_LIBEC.chaine();
   // As for a typed line: no VAT code or rate when the dossier does not manage VAT.
-  if (TVA_GR_ACTIF == 0) {
-    MIRVAL_COTVA = "";
-    MIRVAL_TXTVA = 0;
+  if (s.TVA_GR_ACTIF == 0) {
+    s.MIRVAL_COTVA = "";
+    s.MIRVAL_TXTVA = 0;
   } else {
-    MIRVAL_COTVA = MODLI_COL_COTVA.estVide() ? COMPT2_COTVA.chaine() : MODLI_COL_COTVA.chaine();
-    lireOuVider(CDTVA, CDTVA_COTVA, MIRVAL_COTVA);
-    EvtParamRef taux(3, &CDTVA_COTVA, &MIRVAE_DTOPE, &VTXTVA);
-    compta("LECTURE_HISTO_TXTVA", &taux);
-    MIRVAL_TXTVA = VTXTVA.decimal();
+    s.MIRVAL_COTVA = MODLI_COL_COTVA.estVide() ? s.COMPT2_COTVA.chaine() : MODLI_COL_COTVA.chaine();
+    EntryScreen::lireOuVider(s.CDTVA, s.CDTVA_COTVA, s.MIRVAL_COTVA);
+    EvtParamRef taux(3, &s.CDTVA_COTVA, &s.MIRVAE_DTOPE, &s.VTXTVA);
+    s.compta("LECTURE_HISTO_TXTVA", &taux);
+    s.MIRVAL_TXTVA = s.VTXTVA.decimal();
   }
-  MIRVAL_CPOST = COMPT2_CPOST;
-  MIRVAL_CCRIT = COMPT2_CCRIT;
-  procedure("AJOUTER_LIGNE");
+  s.MIRVAL_CPOST = s.COMPT2_CPOST;
+  s.MIRVAL_CCRIT = s.COMPT2_CCRIT;
+  s.procedure("AJOUTER_LIGNE");
 }
 
 // ---------------------------------------------------------------------------- import of a duplicated operation

@@ -1,0 +1,76 @@
+// The parts of an entry screen that some kinds have and others not.
+#pragma once
+
+#include <string>
+
+#include "entry/gestion.h"
+
+namespace entry {
+
+// The header account of invoices and expense notes: the counterparty typed by its
+// label (VLIBCP1) into MIRVAE.NUMCP, chosen among the accounts of the kind's nature.
+class HeaderAccount : public Part {
+ public:
+  explicit HeaderAccount(EntryScreen& screen);
+
+  void provide(Handlers& handlers) override;
+  void started() override;
+  void opened() override;
+  bool headerAccepted(Evt* e) override;
+  bool chooses(const std::string& control) override;
+  bool takesModelAccount(const std::string& account) override;
+
+  virtual void vlibcp1(Evt* e);
+  virtual void compt1_choisir(Evt* e);
+
+  Chaine VNUMCP1{"VNUMCP1", "", "", 0, &s_};
+  Chaine VLIBCP1{"VLIBCP1", "", "", 0, &s_};
+  Table COMPT1{&s_, "", "COMPT", "COMPT1"};
+  Champ COMPT1_NUMCP{"NUMCP", &COMPT1};
+  Champ COMPT1_LIBCP{"LIBCP", &COMPT1};
+  Champ COMPT1_NATUC{"NATUC", &COMPT1};
+  Champ COMPT1_CCTRA{"CCTRA", &COMPT1};
+
+ protected:
+  // The nature letter the header account must have.
+  virtual std::string nature() { return s_.kind().headerNature; }
+};
+
+// Entry models of the accounting application (MODTE, MODLI): a model chosen by its
+// code on a new operation fills its piece number, label, header account and lines.
+class EntryModels : public Part {
+ public:
+  // The branches of the part, in the order they are registered.
+  static constexpr std::string_view kBranches[] = {"V_CMODEL", "V_CMODEL_CHOISIR", "MODTE_CHOISIR", "MODTE_GENERER"};
+
+  explicit EntryModels(EntryScreen& screen);
+
+  void provide(Handlers& handlers) override;
+  void creationStarted() override;
+  void creationShown() override;
+  void modificationStarted() override;
+  void choiceMade(const std::string& choice) override;
+
+  void v_cmodel(Evt* e);
+  void v_cmodel_choisir(Evt* e);
+  void modte_choisir(Evt* e);
+  void modte_generer(Evt* e);
+
+  Chaine V_CMODEL{"V_CMODEL", "", "!(11)", 0, &s_};
+  Table MODTE{&s_, "", "MODTE", ""};
+  Table MODLI{&s_, "", "MODLI", ""};
+  Champ MODTE_CODE{"CODE", &MODTE};
+  Champ MODTE_NUMJL{"NUMJL", &MODTE};
+  Champ MODTE_NPIEC{"NPIEC", &MODTE};
+  Champ MODTE_INPIE{"INPIE", &MODTE};
+  Champ MODLI_NLIGNE{"NLIGNE", &MODLI};
+  Champ MODLI_COL_NUMCP{"COL_NUMCP", &MODLI};
+  Champ MODLI_COL_LIBEC{"COL_LIBEC", &MODLI};
+  Champ MODLI_COL_COTVA{"COL_COTVA", &MODLI};
+
+ private:
+  // Adds a line of the current model line on the account read into COMPT2.
+  void addModelLine();
+};
+
+}  // namespace entry
