@@ -46,7 +46,7 @@ const std::vector<std::string_view> kInvoiceBranches = {
 
 
 std::vector<std::string_view> branchesWithout(std::vector<std::string_view> order,
-                                              std::initializer_list<std::string_view> left,
+                                              std::span<const std::string_view> left,
                                               std::initializer_list<std::string_view> added) {
   std::erase_if(order, [&](std::string_view name) { return std::find(left.begin(), left.end(), name) != left.end(); });
   order.insert(order.end(), added.begin(), added.end());
@@ -413,7 +413,7 @@ void EntryScreen::creat2(Evt* e) {
   COURS_ORIGINE = MIRVAE_COURS;
   lireJournal();
   MIRVAE_NPIEC = JONAL_NUMEROPI == "A" ? kPiecePlaceholder : "";
-  if (JONAL_PREFIXIN.estVide()) MIRVAE_INPIE = kind_.defaultLabel;
+  if (JONAL_PREFIXIN.estVide()) MIRVAE_INPIE = defaultLabel();
   // The copy has no ledger piece of its own.
   MIRVAE_NPIES = "";
   Gestion_document2::creation2(e);
@@ -446,7 +446,7 @@ void EntryScreen::debut_creation(Evt* e) {
   EvtParamRef devise(1, &MIRVAE_MONNAIE_IDENT);
   appelerProcedure("*1", "MONNAIE", "INTERFACE", "LECTURE", &devise, -1);
 
-  if (JONAL_PREFIXIN.estVide()) MIRVAE_INPIE = kind_.defaultLabel;
+  if (JONAL_PREFIXIN.estVide()) MIRVAE_INPIE = defaultLabel();
   switch (kind_.dueDate) {
     case registry::CreationDueDate::OperationDate: MIRVAE_DTECH = MIRVAE_DTOPE; break;
     case registry::CreationDueDate::Today: MIRVAE_DTECH = Date::dateCourante(); break;

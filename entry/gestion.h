@@ -28,6 +28,7 @@
 
 #include <functional>
 #include <map>
+#include <span>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -46,7 +47,7 @@ class EntryScreen;
 extern const std::vector<std::string_view> kInvoiceBranches;
 // `order` without the branches `left`, then `added`.
 std::vector<std::string_view> branchesWithout(std::vector<std::string_view> order,
-                                              std::initializer_list<std::string_view> left,
+                                              std::span<const std::string_view> left,
                                               std::initializer_list<std::string_view> added = {});
 
 // The handlers a screen's core and parts offer, by branch name.
@@ -113,6 +114,8 @@ class EntryScreen : public model::Gestion_document2 {
   // The side on which a line's amount stands in the ledger: debit for expenses,
   // credit for revenue. The analytic rows of the line stand on the same side.
   virtual bool lineOnDebit() = 0;
+  // The label of a new operation whose journal gives no label prefix.
+  virtual std::string defaultLabel() { return kind_.defaultLabel; }
   // The core's own handlers.
   virtual void provide(Handlers& handlers);
 
@@ -157,7 +160,7 @@ class EntryScreen : public model::Gestion_document2 {
 
   // ---- header checks (gestion_checks.cc)
   void dtope(Evt* e);
-  void controler_compt(Evt* e);
+  virtual void controler_compt(Evt* e);
   void p1_sortie(Evt* e);
   void grp1_sortie(Evt* e);
   void controler_p1(Evt* e);
@@ -244,6 +247,13 @@ class EntryScreen : public model::Gestion_document2 {
   void remplacerPieceDansLibelle();
   // The prefix built from a journal pattern and the operation's year and month.
   std::string prefixe(const Donnee& pattern, const std::string& yearMonth);
+  // The label of an account nature letter.
+  std::string natureLabel(const std::string& letter);
+  // Reads into COMPT the account whose `column` ("NUMCP" or "LIBCP") is `value`,
+  // as the lists offer it; false when the account does not exist.
+  bool readAccountForCheck(const std::string& column, const Donnee& value);
+  // The account check failed: shows `message` and leaves the method result at 1.
+  void refuserCompte(Evt* e, const std::string& message);
   // Rounds a VAT amount to the decimals of the operation's currency.
   Decimal arrondiTva(const Decimal& amount);
   // Shows the line being typed again.

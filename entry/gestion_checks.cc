@@ -22,35 +22,40 @@ void EntryScreen::controler_compt(Evt* e) {
   if (P_2.estVide()) return;
 
   Chaine V_CNATC("V_CNATC", "", "", 4, this), V_INATC("V_INATC", "", "", 4, this);
-  Chaine V_MESSAGE("V_MESSAGE", "", "", 4, this);
   V_CNATC = P_3;
+  V_INATC = natureLabel(V_CNATC.chaine());
+  if (!readAccountForCheck(P_1.chaine(), P_2)) return refuserCompte(e, "Le compte est inexistant !");
+  if (COMPT_NATUC.position(V_CNATC.chaine()) == 0) {
+    COMPT.raz();
+    refuserCompte(e, "Le compte n'est pas de nature <" + V_INATC.chaine() + "> !");
+  }
+}
+
+std::string EntryScreen::natureLabel(const std::string& letter) {
+  Chaine V_CNATC("V_CNATC", "", "", 4, this), V_INATC("V_INATC", "", "", 4, this);
+  V_CNATC = letter;
   EvtParamRef nature(2, &V_CNATC, &V_INATC);
   compta("LIBELLE_NATURE_COMPTE", &nature);
-  V_MESSAGE = "Le compte est inexistant !";
+  return V_INATC.chaine();
+}
 
-  Champ colonne(P_1.chaine().c_str(), &COMPT);
-  if (COMPT.lit(3, colonne, '=', P_2) != 0) {
-    messageOk(V_MESSAGE.chaine());
-    erreurMethode(1, e);
-    return;
-  }
-  // The account again, among those a list of this nature offers: an account left
-  // out of the lists (CCTRA "O") reads blank and fails the nature test below.
+bool EntryScreen::readAccountForCheck(const std::string& column, const Donnee& value) {
+  Champ colonne(column.c_str(), &COMPT);
+  if (COMPT.lit(3, colonne, '=', value) != 0) return false;
+  // The account again, among those the lists offer: an account left out of them
+  // (CCTRA "O") reads blank and fails every nature test.
   COMPT.initRequete();
-  if (!V_CNATC.estVide()) COMPT.ajouteFiltre(COMPT_NATUC, '?', V_CNATC);
   COMPT.ajouteFiltre(COMPT_CCTRA, '#', "O");
-  COMPT.ajouteFiltre(colonne, '=', P_2);
-  COMPT.choisitIndex(P_1.chaine().c_str());
+  COMPT.ajouteFiltre(colonne, '=', value);
+  COMPT.choisitIndex(column.c_str());
   COMPT.activeRequete();
   if (COMPT.suivant(3) != 0) COMPT.raz();
+  return true;
+}
 
-  V_MESSAGE = "";
-  if (COMPT_NATUC.position(V_CNATC.chaine()) == 0)
-    V_MESSAGE = "Le compte n'est pas de nature <" + V_INATC.chaine() + "> !";
-  if (!V_MESSAGE.estVide()) {
-    messageOk(V_MESSAGE.chaine());
-    erreurMethode(1, e);
-  }
+void EntryScreen::refuserCompte(Evt* e, const std::string& message) {
+  messageOk(message);
+  erreurMethode(1, e);
 }
 
 void EntryScreen::p1_sortie(Evt*) {}

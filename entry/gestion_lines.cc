@@ -165,7 +165,11 @@ void EntryScreen::compt2_choisir(Evt*) {
   bool parNumero = V_SAISIE_COMPT == "NUMCP";
   Chaine& valeur = parNumero ? VNUMCP2 : VLIBCP2;
   const char* colonne = parNumero ? "NUMCP" : "LIBCP";
-  EvtParamRef choix(5, &valeur, parNumero ? &COMPT2_NUMCP : &COMPT2_LIBCP, kind_.lineNature, colonne, "N");
+  // The window opens on the kind's pattern of accounts, if it has one.
+  Chaine pattern(kind_.lineAccountPattern);
+  Donnee* start = *kind_.lineAccountPattern ? static_cast<Donnee*>(&pattern)
+                                            : parNumero ? &COMPT2_NUMCP : &COMPT2_LIBCP;
+  EvtParamRef choix(5, &valeur, start, kind_.lineNature, colonne, "N");
   appelerProcedure("*", "CPCOMPT", "INTERFACE", "CHOIX_INTITULE_REDUIT", &choix, -1);
   EvtParamVal controle(3, colonne, &valeur, kind_.lineNature);
   procedure("CONTROLER_COMPT", &controle);

@@ -2,6 +2,8 @@
 
 #include "access/acces.h"
 #include "entry/gestion1.h"
+#include "entry/gestion2.h"
+#include "entry/gestion3.h"
 #include "host/registry.h"
 #include "host/value.h"
 #include "posting/creer_piece_fc.h"
@@ -33,6 +35,16 @@ void declarerUnites() {
   static const Module verifierModifPiece("", "MIRVAE-VERIFIER_MODIF_PIECE",
                                          &host::fabriquer<MIRVAEVerifier_modif_piece>, false, "");
   static const Source postingSource("MIRVAE", nullptr);
+
+  // Unit CREER_PIECE_FF, GESTION2.
+  static const Global supplierGlobal("MIRVAE", "MIRVAE");
+  static const Module gestion2("", "MIRVAE-GESTION2", &host::fabriquer<MIRVAEGestion2>, false, "");
+  static const Source supplierSource("MIRVAE", nullptr);
+
+  // Unit CREER_PIECE_NDF, GESTION3.
+  static const Global expenseGlobal("MIRVAE", "MIRVAE");
+  static const Module gestion3("", "MIRVAE-GESTION3", &host::fabriquer<MIRVAEGestion3>, false, "");
+  static const Source expenseSource("MIRVAE", nullptr);
 
   // Unit INTERFACE: it also works with the globals of the general-ledger library.
   static const Global interfaceComptaGlobal("COMPTA", "MIRVAE");

@@ -58,6 +58,8 @@ struct OperationKind {
   const char* headerUnknownOpen;  // opened record whose account is gone: + number + "> inexistant !"
   const char* rowUnknownTitle;    // a browser's row whose account is gone: + number + "> inexistant !"
   const char* lineAccountRequired;
+  // Pattern the line account choice window opens with ("625*"), "" for none.
+  const char* lineAccountPattern = "";
 
   // Names, made from the digit and the type.
   std::string accessModule() const { return "MIRVAE-ACCES" + std::to_string(number); }  // registry name

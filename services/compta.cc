@@ -306,4 +306,16 @@ void Choix_modele_ecritures::faire(Evt* e) {
   e->parametre(0) = pick ? 1 : 0;
 }
 
+Choix_table::Choix_table(Evt* e, const char* window, const char* table, const char* code, const char* label)
+    : Traitmnt(e), window_(window), table_(table), code_(code), label_(label) {}
+
+void Choix_table::faire(Evt* e) {
+  exigerParametres(e, 2);
+  std::vector<std::string> codes =
+      colonne(session().base(), std::string("SELECT ") + code_ + " FROM " + table_ + " ORDER BY " + label_);
+  std::optional<std::string> pick = fenetreDeChoix(session(), window_, codes);
+  if (pick) e->parametre(0) = *pick;
+  e->parametre(1) = pick ? "0" : "1";
+}
+
 }  // namespace services

@@ -93,4 +93,29 @@ class Choix_modele_ecritures : public model::Traitmnt {
   void faire(host::Evt* e) override;
 };
 
+// "CHOIX_TABLE_TYPFR" (expense types) and "CHOIX_TABLE_TYPLB" (standard piece
+// labels): the choice window of a table of standard texts, (code out, result out).
+// The result is "0" with the chosen code, "1" when the window was closed without one.
+class Choix_table : public model::Traitmnt {
+ public:
+  Choix_table(host::Evt* e, const char* window, const char* table, const char* code, const char* label);
+  void faire(host::Evt* e) override;
+
+ private:
+  const char* window_;
+  const char* table_;
+  const char* code_;
+  const char* label_;
+};
+
+class Choix_table_typfr : public Choix_table {
+ public:
+  explicit Choix_table_typfr(host::Evt* e) : Choix_table(e, "Types de frais", "TYPFR", "CTYFR", "ITYFR") {}
+};
+
+class Choix_table_typlb : public Choix_table {
+ public:
+  explicit Choix_table_typlb(host::Evt* e) : Choix_table(e, "Libellés types", "TYPLB", "CTYLB", "ITYLB") {}
+};
+
 }  // namespace services

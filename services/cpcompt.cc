@@ -22,21 +22,23 @@ void Cpcompt::choix_intitule_reduit(Evt* e) {
   std::string column = e->parametre(3).chaine();
   if (column != "NUMCP" && column != "LIBCP")
     throw HostError("colonne « " + column + " » inconnue de la fenêtre de choix des comptes");
-  // A pattern ending with "*" narrows the window to the values that begin with it:
-  // the one the caller gives, else the beginning the user typed in the value itself.
+  // A pattern ending with "*" narrows the window: the one the caller gives, to the
+  // accounts whose number begins with it; else the beginning the user typed in the
+  // value itself, to the values of the column that begin with it.
   auto pattern = [](const std::string& text) {
     return !text.empty() && text.back() == '*' ? text.substr(0, text.size() - 1) : std::string();
   };
-  std::string prefix = pattern(start);
-  if (prefix.empty()) prefix = pattern(e->parametre(0).chaine());
+  std::string numbers = pattern(start);
+  std::string typed = numbers.empty() ? pattern(e->parametre(0).chaine()) : std::string();
+  std::string prefix = numbers.empty() ? typed : numbers;
 
   Statement& s = session().base().prepare("SELECT NUMCP, LIBCP, NATUC FROM COMPT WHERE CCTRA <> 'O' ORDER BY " +
                                           column + ", NUMCP");
   std::vector<std::string> rows;
   while (s.step()) {
-    std::string value = column == "NUMCP" ? s.text(0) : s.text(1), nature = s.text(2);
+    std::string number = s.text(0), value = column == "NUMCP" ? number : s.text(1), nature = s.text(2);
     bool natureFits = natures.empty() || nature.find_first_of(natures) != std::string::npos;
-    if (natureFits && value.starts_with(prefix)) rows.push_back(value);
+    if (natureFits && number.starts_with(numbers) && value.starts_with(typed)) rows.push_back(value);
   }
   s.reset();
 

@@ -5,8 +5,9 @@
 //       the nature letters (any account when there are none) and that are not left
 //       out of the lists (CCTRA "O"), by the column "NUMCP" or "LIBCP", in that
 //       column's order. `start` is either the field the caller shows (not read) or
-//       a pattern ending with "*" ("421*": numbers beginning with 421); without one,
-//       a value ending with "*" (typed "70*") is the pattern. The pick, in the chosen
+//       a pattern ending with "*" ("421*": numbers beginning with 421, whichever
+//       column is shown); without one, a value ending with "*" (typed "70*") keeps
+//       the values of the column that begin with it. The pick, in the chosen
 //       column, is written into the first parameter; a cancelled
 //       window leaves it unchanged and sets the method result to 1. The last
 //       parameter is accepted and not read.

@@ -26,6 +26,8 @@ void chargerServices() {
   Module("", "COMPTA-VISUECRI", &fabriquer<Visuecri>, false, "");
   Module("", "COMPTA-LANCE_REOUVERTURE_ANNU", &fabriquer<Lance_reouverture_annu>, false, "");
   Module("", "COMPTA-CHOIX_MODELE_ECRITURES", &fabriquer<Choix_modele_ecritures>, false, "");
+  Module("", "COMPTA-CHOIX_TABLE_TYPFR", &fabriquer<Choix_table_typfr>, false, "");
+  Module("", "COMPTA-CHOIX_TABLE_TYPLB", &fabriquer<Choix_table_typlb>, false, "");
   Module("", "CPCOMPT-INTERFACE", &fabriquer<Cpcompt>, false, "");
   Module("", "CPCDTVA-INTERFACE", &fabriquer<Cpcdtva>, false, "");
   Module("", "CPPARAM-INTERFACE", &fabriquer<Cpparam>, false, "");

@@ -25,7 +25,7 @@ class DocumentTest : public Gestion1Test {
   std::string mode() { return ecran().modeCourant(); }
 };
 
-TEST_F(DocumentTest, RegisteredInThePostingUnitWithItsBranchTable) {
+TEST_F(DocumentTest, RegisteredInThePostingUnit) {
   std::vector<std::string> modules = host::Registre::instance().modules();
   auto at = std::find(modules.begin(), modules.end(), "MIRVAE-GESTION1");
   ASSERT_NE(at, modules.end());
@@ -39,11 +39,6 @@ TEST_F(DocumentTest, RegisteredInThePostingUnitWithItsBranchTable) {
   ASSERT_NE(dynamic_cast<MIRVAEGestion1*>(&ecran()), nullptr);
   EXPECT_EQ(mode(), "C");
   EXPECT_EQ(valeur("PIDENT"), "");
-  const std::vector<std::string>& branches = ecran().branches();
-  EXPECT_EQ(branches.size(), 91u);
-  EXPECT_EQ(branches.front(), "INIT");
-  EXPECT_EQ(branches[3], "CTRL_CACHE_COLONNE ");
-  EXPECT_EQ(branches.back(), "MAJ_LIGNES_MEMOIRE");
   EXPECT_EQ(ecran().ecran()->commandeLibelle(1), "Infos fiche");
   EXPECT_TRUE(appuyer("CTRL_CACHE_COLONNE "));
   EXPECT_EQ(dernierMessage(), "Cette liste n'est pas personnalisable.");

@@ -1,6 +1,6 @@
-// The client invoice screen driven as a user would, on a fresh demo dossier
-// (today 15/03/2024, exercise 2024, sales journal VT numbered automatically with the
-// prefix "VT" and a monthly restart).
+// An entry screen driven as a user would, the client invoice screen unless a test
+// sets `kind_`, on a fresh demo dossier (today 15/03/2024, exercise 2024, sales
+// journal VT numbered automatically with the prefix "VT" and a monthly restart).
 #pragma once
 
 #include <string>
@@ -17,7 +17,7 @@ namespace testing_support {
 class Gestion1Test : public DossierTest {
  protected:
   // Opens a new creation, as from the menu.
-  bool creer() { return model::ouvrir(session(), "MIRVAE-GESTION1"); }
+  bool creer() { return model::ouvrir(session(), "MIRVAE-GESTION" + std::to_string(kind_)); }
 
   // Opens operation `ident` with a mode string, as the browser does.
   bool ouvrirFiche(const std::string& ident, const std::string& mode) {
@@ -25,13 +25,14 @@ class Gestion1Test : public DossierTest {
       explicit Lanceur(host::Evt* e) : Traitmnt(e) {}
     } lanceur(nullptr);
     return session().action([&] {
-      lanceur.lancerModule("", "MIRVAE", "GESTION1", new host::EvtParamVal(2, ident, mode));
+      lanceur.lancerModule("", "MIRVAE", ("GESTION" + std::to_string(kind_)).c_str(),
+                           new host::EvtParamVal(2, ident, mode));
       session().executerFile();
     });
   }
 
   entry::EntryScreen& ecran() { return dynamic_cast<entry::EntryScreen&>(model::ecranDevant(session())); }
-  bool ouvert() { return session().ecran("MIRVAE-GESTION1") != nullptr; }
+  bool ouvert() { return session().ecran("MIRVAE-GESTION" + std::to_string(kind_)) != nullptr; }
 
   bool saisir(const std::string& object, const std::string& text) {
     return model::saisir(session(), object, text);
@@ -41,6 +42,8 @@ class Gestion1Test : public DossierTest {
 
   // A header that passes every check: the client, today's date, the first sales journal.
   bool client(const std::string& label = "Brasserie Lissandre") { return saisir("VLIBCP1", label); }
+
+  int kind_ = 1;
 
   // Types a line: account, then (when given) VAT code, then amount; validates it when asked.
   bool ligne(const std::string& account, const std::string& amount, const std::string& vatCode = "-",

@@ -241,24 +241,34 @@ TEST_F(LignesTest, AnalyticBreakdownIsAskedOnlyForAnAccountThatTakesIt) {
   EXPECT_EQ(analyticLaunches.size(), 1u);
 }
 
-TEST_F(LignesTest, TheAnalyticScreenGetsTheLineAsACreditOrAReversedDebit) {
-  sql("UPDATE COMPT SET CSECT = 'ATELIER', SAANA = 'O' WHERE NUMCP = '706000'");
+TEST_F(LignesTest, TheAnalyticScreenGetsTheLineOnTheSideOfItsMovement) {
+  sql("UPDATE COMPT SET CPOST = 'PROD', CCRIT = 'ATEL', CSECT = 'ATELIER', SAANA = 'O' "
+      "WHERE NUMCP IN ('706000', '601000')");
+  // Revenue stands on the credit, expenses on the debit; a negative line, on the other side.
   const struct {
+    int kind;
+    const char* header;
+    const char* account;
     const char* saisieMtt;
     const char* typed;
     const char* debitCreditSign;  // of the amount excluding tax, whichever was typed
   } cases[] = {
-      {"1", "100", "0.00|100.00|1"},
-      {"1", "-100", "100.00|0.00|-1"},
-      {"2", "120", "0.00|100.00|1"},
-      {"2", "-120", "100.00|0.00|-1"},
+      {1, "Brasserie Lissandre", "706000", "1", "100", "0.00|100.00|1"},
+      {1, "Brasserie Lissandre", "706000", "1", "-100", "100.00|0.00|-1"},
+      {1, "Brasserie Lissandre", "706000", "2", "120", "0.00|100.00|1"},
+      {1, "Brasserie Lissandre", "706000", "2", "-120", "100.00|0.00|-1"},
+      {2, "Scierie Maurel Frères", "601000", "1", "100", "100.00|0.00|1"},
+      {2, "Scierie Maurel Frères", "601000", "1", "-100", "0.00|100.00|-1"},
+      {3, "Bonnefon Lucas", "601000", "2", "120", "100.00|0.00|1"},
+      {3, "Bonnefon Lucas", "601000", "1", "-100", "0.00|100.00|-1"},
   };
   for (const auto& c : cases) {
-    SCOPED_TRACE(std::string(c.saisieMtt) + " " + c.typed);
+    SCOPED_TRACE(std::to_string(c.kind) + " " + c.saisieMtt + " " + c.typed);
+    kind_ = c.kind;
     ASSERT_TRUE(creer());
     ASSERT_TRUE(saisir("MIRVAE.SAISIE_MTT", c.saisieMtt));
-    ASSERT_TRUE(client());
-    ASSERT_TRUE(ligne("706000", c.typed));
+    ASSERT_TRUE(client(c.header));
+    ASSERT_TRUE(ligne(c.account, c.typed, c.kind == 1 ? "V20" : "A20"));
     ASSERT_TRUE(model::allerLigne(session(), 1));
     analyticLaunches.clear();
     ASSERT_TRUE(appuyer("BT_ANALYTIQUE"));

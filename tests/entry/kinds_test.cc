@@ -1,0 +1,139 @@
+// What the entry screens of the kinds share and where they differ: their branch
+// tables, a new operation's defaults, the supplier's account natures, and the expense
+// note's counterparty and line labels.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+
+#include "tests/entry/gestion1_fixture.h"
+
+namespace {
+
+using testing_support::Gestion1Test;
+
+class KindsTest : public Gestion1Test {};
+
+TEST_F(KindsTest, EachKindRegistersEveryBranchOnceInItsOrder) {
+  // The client invoice's, in the order of its registration.
+  const std::vector<std::string> invoice = {
+      "INIT", "CTRL_DEFAUT_COLONNE", "CTRL_CUSTOM_COLONNE", "CTRL_CACHE_COLONNE ", "AVANT_DEBUT", "DEBUT",
+      "SELECTION_TRI", "COMMANDE1", "INFO_FICHE", "CONSTITUER_INFO_FICHE", "COMPLETER_INFO_FICHE", "IMPRIME",
+      "IMPR_FICHE", "MODIFICATION", "CREAT2", "DEBUT_VISUALISATION", "DEBUT_MODIFICATION", "DEBUT_CREATION",
+      "APRES_DEBUT_CREATION", "FIN_CREATION", "IMPORTATION_LIGNES", "DEBUT_FICHE", "V_CMODEL",
+      "V_CMODEL_CHOISIR", "MODTE_CHOISIR", "MODTE_GENERER", "DTOPE", "VLIBCP1", "COMPT1_CHOISIR",
+      "CONTROLER_COMPT", "NPIEC_ENTREE", "NPIEC", "PREFIXE_NUMERO_PIECE", "INPIE_ENTREE",
+      "PREFIXE_INTITULE_PIECE", "P1_SORTIE", "GRP1_SORTIE", "CONTROLER_P1", "CONTROLER_GRP1", "SELECTION",
+      "CTRL_DEBUT_LIGNE", "DEBUT_CREATION_LIGNE", "GESTION_ANALY_OUI_NON", "LST_ENTREE",
+      "INCREMENTE_NUMERO_PIECE", "V_SAISIE_COMPT2_FERME", "V_SAISIE_COMPT", "SAISIE_MTT", "LST_MIRVAL.NUMCP",
+      "LST_VLIBCP2", "COMPT2_CHOISIR", "LST_V_HT", "LST_MIRVAL.COTVA", "CDTVA_CHOISIR", "LST_MIRVAL.TVA",
+      "CALCUL_MTT_LIGNE", "CALCUL_TVA_SELON_HT", "CALCUL_TVA_SELON_TTC", "CALCUL_TTC", "CALCUL_HT",
+      "B_VALID_DOC", "VALID_DOC", "VALIDATION", "CONTROLER_LST", "APRES_VALIDATION", "AVANT_SUPPRESSION",
+      "B_ABAND_DOC", "VALIDATION_LIGNE", "APRES_VALIDATION_LIGNE", "APRES_SUPPRESSION_LIGNE", "BT_ANALYTIQUE",
+      "APPEL_ANALYTIQUE", "CALCUL_TOTAUX", "EXTRACTION_DONNEES", "EXTRACTION_TABLE_MIRVAANA",
+      "SUPPRESSION_DONNEES", "SUPPRESSION_TABLE_MIRVAANA", "VALIDATION_DONNEES", "VALIDATION_TABLE_MIRVAANA",
+      "CTRL_CHOISIR", "CTRL_OUVRE", "DIALOGUE", "MONNAIE_CHOISIR", "MONNAIE_IDENT", "COURS", "CTRL_BASCULER",
+      "CTRL_ACTUALISER_MODE", "CTRL_ACTUALISER_BASCULE", "ACTUALISER_INFO_MONETAIRES", "DEFINIR_BASCULE",
+      "MAJ_LIGNES_MEMOIRE",
+  };
+  const std::vector<std::string> models = {"V_CMODEL", "V_CMODEL_CHOISIR", "MODTE_CHOISIR", "MODTE_GENERER"};
+  const struct {
+    int kind;
+    std::vector<std::string> left, added;
+  } cases[] = {
+      {1, {}, {}},
+      {2, {}, {}},
+      {3, models, {"VTIERS1", "VTIERS1_FERME", "FAIT_INPIE", "TYPFR_CHOISIR", "LST_MIRVAL.LIBEC", "LIRE_LIGNE_PRECEDENTE"}},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.kind);
+    kind_ = c.kind;
+    std::vector<std::string> expected;
+    std::copy_if(invoice.begin(), invoice.end(), std::back_inserter(expected),
+                 [&](const std::string& name) { return std::find(c.left.begin(), c.left.end(), name) == c.left.end(); });
+    expected.insert(expected.end(), c.added.begin(), c.added.end());
+    ASSERT_TRUE(creer());
+    EXPECT_EQ(ecran().branches(), expected);
+    // A part the kind lacks leaves none of its declarations behind.
+    EXPECT_EQ(ecran().variable("V_CMODEL") != nullptr, c.left.empty());
+    model::fermer(session());
+  }
+}
+
+TEST_F(KindsTest, ANewOperationTakesItsKindsDefaults) {
+  const struct {
+    int kind;
+    const char *type, *journal, *label;
+  } cases[] = {
+      {1, "FC", "VT", "Facture client n° "},
+      {2, "FF", "AC", "Facture fournisseur n° "},
+      {3, "NDF", "AC", "Note de frais personnel n° "},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.kind);
+    kind_ = c.kind;
+    ASSERT_TRUE(creer());
+    EXPECT_EQ(valeur("MIRVAE.TYPE"), c.type);
+    EXPECT_EQ(valeur("MIRVAE.NUMJL"), c.journal);
+    EXPECT_EQ(valeur("MIRVAE.DTECH"), "15/03/2024");
+    EXPECT_EQ(valeur("MIRVAE.SAISIE_MTT"), "1");
+    EXPECT_TRUE(valeur("MIRVAE.INPIE").starts_with(c.label)) << valeur("MIRVAE.INPIE");
+    model::fermer(session());
+  }
+}
+
+TEST_F(KindsTest, ASupplierLineTakesAChargeOrAFixedAssetAndIsToldBothNatures) {
+  kind_ = 2;
+  ASSERT_TRUE(creer());
+  ASSERT_TRUE(client("Scierie Maurel Frères"));
+  EXPECT_TRUE(ligne("218300", "100"));
+  EXPECT_TRUE(ligne("601000", "100"));
+  EXPECT_FALSE(ligne("708500", "100"));
+  EXPECT_EQ(dernierMessage(), "Le compte n'est pas de nature <Charge>@ni <Immobilisation>");
+  // The header account is a supplier's.
+  EXPECT_FALSE(client("Brasserie Lissandre"));
+  EXPECT_EQ(dernierMessage(), "Le compte n'est pas de nature <Fournisseur>");
+}
+
+TEST_F(KindsTest, AnExpenseNoteIsAStaffMembersUntilItsCounterpartyTypeChanges) {
+  kind_ = 3;
+  ASSERT_TRUE(creer());
+  EXPECT_EQ(valeur("VTIERS"), "P");
+  // Staff are chosen by number among the accounts beginning with 421.
+  user_.ajouterChoix("421002");
+  ASSERT_TRUE(model::ouvrirChoix(session(), "VLIBCP1"));
+  EXPECT_EQ(session().transcript().textes("choix").back(), "Comptes de nature A commençant par 421");
+  EXPECT_EQ(valeur("VLIBCP1"), "Roques Émilie");
+  EXPECT_EQ(valeur("MIRVAE.NUMCP"), "421002");
+  // A supplier: the staff member goes and the label follows.
+  ASSERT_TRUE(saisir("VTIERS", "F"));
+  ASSERT_TRUE(appuyer("VTIERS1"));
+  EXPECT_EQ(valeur("VLIBCP1"), "");
+  EXPECT_EQ(valeur("MIRVAE.NUMCP"), "");
+  EXPECT_TRUE(valeur("MIRVAE.INPIE").starts_with("Facture frais fournisseur n° ")) << valeur("MIRVAE.INPIE");
+  EXPECT_FALSE(client("Roques Émilie"));
+  EXPECT_TRUE(client("Scierie Maurel Frères"));
+  // No type, no choice.
+  ASSERT_TRUE(saisir("VTIERS", ""));
+  EXPECT_TRUE(model::ouvrirChoix(session(), "VLIBCP1"));
+  EXPECT_EQ(dernierMessage(), "La saisie d'un type de tiers est obligatoire !");
+}
+
+TEST_F(KindsTest, AnExpenseLineIsLabelledByItsTypeOrByTheLineBefore) {
+  kind_ = 3;
+  ASSERT_TRUE(creer());
+  ASSERT_TRUE(client("Bonnefon Lucas"));
+  ASSERT_TRUE(ligne("625100", "40", "-", false));
+  user_.ajouterChoix("REPAS");
+  ASSERT_TRUE(model::ouvrirChoix(session(), "LST_MIRVAL.LIBEC"));
+  EXPECT_EQ(valeur("LST_MIRVAL.LIBEC"), "Frais de repas");
+  ASSERT_TRUE(model::validerLigne(session()));
+  ASSERT_TRUE(ligne("625600", "12", "-", false));
+  ASSERT_TRUE(saisir("LST_MIRVAL.LIBEC", " "));
+  EXPECT_EQ(valeur("LST_MIRVAL.LIBEC"), "Frais de repas");
+  // The line account choice opens on the travel expenses.
+  user_.ajouterChoix("Réceptions");
+  ASSERT_TRUE(model::ouvrirChoix(session(), "LST_MIRVAL.NUMCP"));
+  EXPECT_EQ(session().transcript().textes("choix").back(), "Comptes de nature H commençant par 625");
+}
+
+}  // namespace
