@@ -6,6 +6,10 @@
 // the typed one plus or minus that VAT, so HT + TVA = TTC holds on every line.
 #include "entry/gestion.h"
 
+#include <array>
+
+#include "registry/analytic_call.h"
+
 namespace entry {
 
 namespace {
@@ -392,8 +396,21 @@ void EntryScreen::appel_analytique(Evt*) {
 
   if (visualisation) procedure("EXTRACTION_TABLE_MIRVAANA");
 
-  EvtParamRef analytique(11, &MIRVAL_IDENT, &PMODE, &MIRVAE_DTOPE, &MIRVAE_COURS, &MIRVAL_CPOST, &MIRVAL_CCRIT,
-                         &COMPT_CSECT, &V_MTDEB, &V_MTCRE, &V_SIGNE, &COMPT_SAANA);
+  namespace analytic = registry::analytic;
+  std::array<Donnee*, analytic::kCount> params{};
+  params[analytic::PIDENT] = &MIRVAL_IDENT;
+  params[analytic::PMODE] = &PMODE;
+  params[analytic::P_DTOPE] = &MIRVAE_DTOPE;
+  params[analytic::P_COURS] = &MIRVAE_COURS;
+  params[analytic::P_CPOST] = &MIRVAL_CPOST;
+  params[analytic::P_CCRIT] = &MIRVAL_CCRIT;
+  params[analytic::P_CSECT] = &COMPT_CSECT;
+  params[analytic::P_MTDEBS] = &V_MTDEB;
+  params[analytic::P_MTCRES] = &V_MTCRE;
+  params[analytic::P_SIGNE] = &V_SIGNE;
+  params[analytic::P_SAISIE_OBLIGATOIRE] = &COMPT_SAANA;
+  Evt analytique;
+  for (Donnee* param : params) analytique.ajouterReference(*param);
   appelerModule("", "MIRVAE", "GEST_ANA", &analytique);
   // The line itself is kept by the document; showing it again is all it needs.
   if (!visualisation) afficherLigne();
