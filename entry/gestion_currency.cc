@@ -15,6 +15,8 @@
 // conversion pair again.
 #include "entry/gestion.h"
 
+#include "model/child_rows.h"
+
 #include "host/currency.h"
 #include "host/error.h"
 
@@ -176,16 +178,9 @@ void EntryScreen::convertAmounts(const std::function<Decimal(const Decimal&)>& c
     // A line without identifier has no analytic rows yet; its empty prefix would
     // select every row.
     if (ident.empty()) continue;
-    MIRVAANA_M01.initRequete();
-    MIRVAANA_M01.ajouteFiltre(MIRVAANA_M01_NUMERO, '/', ident + "|");
-    MIRVAANA_M01.activeRequete();
-    for (int row = MIRVAANA_M01.suivant(3); row == 0; row = MIRVAANA_M01.suivant(1)) {
-      MIRVAANA_M01_MTADE = convert(MIRVAANA_M01_MTADE.decimal());
-      MIRVAANA_M01_MTACR = convert(MIRVAANA_M01_MTACR.decimal());
-      MIRVAANA_M01.ecrit();
-    }
+    model::convertChildRows(MIRVAANA_M01, MIRVAANA_M01_NUMERO, ident, {&MIRVAANA_M01_MTADE, &MIRVAANA_M01_MTACR},
+                            convert);
   }
-  MIRVAANA_M01.initRequete();
   MEM_MIRVAL.initRequete();
 }
 

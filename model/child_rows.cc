@@ -23,6 +23,19 @@ void copyChildRows(host::Table& from, host::Champ& fromNumero, host::Table& to, 
   to.initRequete();
 }
 
+void convertChildRows(host::Table& table, host::Champ& numero, const std::string& line,
+                      std::initializer_list<host::Champ*> amounts,
+                      const std::function<host::Decimal(const host::Decimal&)>& convert) {
+  table.initRequete();
+  table.ajouteFiltre(numero, '/', prefix(line));
+  table.activeRequete();
+  for (int rc = table.suivant(3); rc == 0; rc = table.suivant(1)) {
+    for (host::Champ* amount : amounts) *amount = convert(amount->decimal());
+    table.ecrit();
+  }
+  table.initRequete();
+}
+
 void removeChildRows(host::Table& table, host::Champ& numero, const std::string& line) {
   table.initRequete();
   table.ajouteFiltre(numero, '/', prefix(line));

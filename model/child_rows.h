@@ -2,10 +2,11 @@
 // rows do: each row's NUMERO is the line's IDENT followed by "|" (the bar keeps a line
 // without identifier from selecting every row). While the document is entered they
 // live in the session's work table, once it is saved in the dossier's table; these
-// copy and remove them one line at a time, for every kind of child row alike.
+// copy, convert and remove them one line at a time, for every kind of child row alike.
 #pragma once
 
 #include <functional>
+#include <initializer_list>
 #include <string>
 
 #include "host/table.h"
@@ -18,6 +19,12 @@ namespace model {
 // inserted. Both tables' requests are reset afterwards.
 void copyChildRows(host::Table& from, host::Champ& fromNumero, host::Table& to, const std::string& line,
                    const std::function<void()>& adjust = nullptr);
+
+// Puts each of the `amounts` of the rows of `line` in `table` through `convert`, as a
+// line's own amounts go when its document changes currency; the request is reset.
+void convertChildRows(host::Table& table, host::Champ& numero, const std::string& line,
+                      std::initializer_list<host::Champ*> amounts,
+                      const std::function<host::Decimal(const host::Decimal&)>& convert);
 
 // Deletes the rows of `line` from `table`, without confirmation; its request is reset.
 void removeChildRows(host::Table& table, host::Champ& numero, const std::string& line);
