@@ -4,7 +4,10 @@
 #include "entry/gestion1.h"
 #include "host/registry.h"
 #include "host/value.h"
+#include "posting/creer_piece_bq.h"
 #include "posting/creer_piece_fc.h"
+#include "posting/creer_piece_ff.h"
+#include "posting/creer_piece_od.h"
 #include "posting/supprimer_piece.h"
 #include "posting/verifier_modif_piece.h"
 #include "printing/interface.h"
@@ -33,6 +36,33 @@ void declarerUnites() {
   static const Module verifierModifPiece("", "MIRVAE-VERIFIER_MODIF_PIECE",
                                          &host::fabriquer<MIRVAEVerifier_modif_piece>, false, "");
   static const Source postingSource("MIRVAE", nullptr);
+
+  // Units of the other kinds' posting processes; each kind's entry screen joins its
+  // posting process in its unit.
+  // Unit CREER_PIECE_FF, GESTION2.
+  static const Global creerPieceFfGlobal("MIRVAE", "MIRVAE");
+  static const Module creerPieceFf("", "MIRVAE-CREER_PIECE_FF", &host::fabriquer<MIRVAECreer_piece_ff>, false, "");
+  static const Source creerPieceFfSource("MIRVAE", nullptr);
+
+  // Unit CREER_PIECE_NDF, GESTION3.
+  static const Global creerPieceNdfGlobal("MIRVAE", "MIRVAE");
+  static const Module creerPieceNdf("", "MIRVAE-CREER_PIECE_NDF", &host::fabriquer<MIRVAECreer_piece_ndf>, false, "");
+  static const Source creerPieceNdfSource("MIRVAE", nullptr);
+
+  // Unit CREER_PIECE_BQ, GESTION4.
+  static const Global creerPieceBqGlobal("MIRVAE", "MIRVAE");
+  static const Module creerPieceBq("", "MIRVAE-CREER_PIECE_BQ", &host::fabriquer<MIRVAECreer_piece_bq>, false, "");
+  static const Source creerPieceBqSource("MIRVAE", nullptr);
+
+  // Unit CREER_PIECE_CA, GESTION5.
+  static const Global creerPieceCaGlobal("MIRVAE", "MIRVAE");
+  static const Module creerPieceCa("", "MIRVAE-CREER_PIECE_CA", &host::fabriquer<MIRVAECreer_piece_ca>, false, "");
+  static const Source creerPieceCaSource("MIRVAE", nullptr);
+
+  // Unit CREER_PIECE_OD, GESTION6.
+  static const Global creerPieceOdGlobal("MIRVAE", "MIRVAE");
+  static const Module creerPieceOd("", "MIRVAE-CREER_PIECE_OD", &host::fabriquer<MIRVAECreer_piece_od>, false, "");
+  static const Source creerPieceOdSource("MIRVAE", nullptr);
 
   // Unit INTERFACE: it also works with the globals of the general-ledger library.
   static const Global interfaceComptaGlobal("COMPTA", "MIRVAE");
