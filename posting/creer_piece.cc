@@ -21,15 +21,15 @@ PostingProcess::PostingProcess(Evt* e, const registry::OperationKind& kind) : Tr
   lancement()->param(0, P_IDENT, 0);
 }
 
-void PostingProcess::enregistrerBranches(const char* contrepartie) {
+void PostingProcess::registerBranches(const char* counterpart) {
   addBranch("DEBUT", &PostingProcess::debut);
   addBranch("FAIRE", &PostingProcess::faire);
   addBranch("FAIT_IMPORT_PIECE", &PostingProcess::fait_import_piece);
   addBranch("CREER_ENTETE", &PostingProcess::creer_entete);
   addBranch("CREER_LIGNE_HT", &PostingProcess::creer_ligne_ht);
   addBranch("CREER_LIGNE_TVA", &PostingProcess::creer_ligne_tva);
-  if (contrepartie) {
-    addBranch(contrepartie, &PostingProcess::creer_ligne_tiers);
+  if (counterpart) {
+    addBranch(counterpart, &PostingProcess::creer_ligne_tiers);
     addBranch("CREER_ECHEANCE", &PostingProcess::creer_echeance);
   }
   addBranch("CREER_ANALYTIQUE", &PostingProcess::creer_analytique);
@@ -53,7 +53,7 @@ void PostingProcess::faire(Evt* e) {
       V_FLAG_E = 1;
     } else {
       procedure("FAIT_IMPORT_PIECE");
-      apresPiece();
+      afterPiece();
     }
   }
   sortir(e, 0);
@@ -77,7 +77,7 @@ void PostingProcess::fait_import_piece(Evt*) {
   table(false)->ecrit();
 
   envoyerLignes();
-  if (!envoyerContrepartie()) return;
+  if (!sendCounterpart()) return;
 
   Chaine valider("O");
   EvtParamRef fin(1, &valider);
@@ -99,18 +99,18 @@ void PostingProcess::envoyerLignes() {
   MIRVAL.ajouteFiltre(MIRVAL_NUMERO, '/', MIRVAE_IDENT + "|");
   MIRVAL.activeRequete();
   for (int rc = MIRVAL.suivant(3); rc == 0; rc = MIRVAL.suivant(1))
-    if (!envoyerLigne()) return;
+    if (!sendLine()) return;
 }
 
-bool PostingProcess::envoyerLigne() {
+bool PostingProcess::sendLine() {
   // A line without an excluding-tax amount makes no movement at all, VAT included.
   if (MIRVAL_HT.decimal().isZero()) return true;
   lireCompte(MIRVAL_NUMCP);
-  if (!envoyerMouvementHt()) return false;
-  return MIRVAL_TVA.decimal().isZero() || envoyerTvaDuCode();
+  if (!sendExcludingTaxMovement()) return false;
+  return MIRVAL_TVA.decimal().isZero() || sendVatOfCode();
 }
 
-bool PostingProcess::envoyerContrepartie() {
+bool PostingProcess::sendCounterpart() {
   lireCompte(MIRVAE_NUMCP);
   procedure("CREER_LIGNE_TIERS");
   if (!importer("DEBUT_LIGNE")) return false;
@@ -122,7 +122,7 @@ bool PostingProcess::envoyerContrepartie() {
   return true;
 }
 
-bool PostingProcess::envoyerMouvementHt() {
+bool PostingProcess::sendExcludingTaxMovement() {
   procedure("CREER_LIGNE_HT");
   EvtParamRef uniq(1, &V_MOUVE_UNIQ);
   if (!importer("DEBUT_LIGNE", &uniq)) return false;
@@ -134,14 +134,14 @@ bool PostingProcess::envoyerMouvementHt() {
   return true;
 }
 
-bool PostingProcess::envoyerTvaDuCode() {
+bool PostingProcess::sendVatOfCode() {
   lireCompte(MIRVAL_NUMCP);
   if (CDTVA.lit(3, CDTVA_COTVA, '=', MIRVAL_COTVA) != 0) CDTVA.raz();
   V_NUMCP = vatAccount();
-  return envoyerMouvementTva();
+  return sendVatMovement();
 }
 
-bool PostingProcess::envoyerMouvementTva() {
+bool PostingProcess::sendVatMovement() {
   procedure("CREER_LIGNE_TVA");
   if (!importer("DEBUT_LIGNE")) return false;
   if (!importer("FIN_LIGNE")) return false;
@@ -149,7 +149,7 @@ bool PostingProcess::envoyerMouvementTva() {
   return true;
 }
 
-Valeur PostingProcess::compteTvaCollectee(VatBasis otherwise) {
+Valeur PostingProcess::salesVatAccount(VatBasis otherwise) {
   VatBasis owed = otherwise;
   for (const Donnee* said : {static_cast<const Donnee*>(&PARAM_PMTVA), static_cast<const Donnee*>(&COMPT_TPTVA)}) {
     if (*said == "E" || *said == "D") {

@@ -67,17 +67,17 @@ class PostingProcess : public model::Traitmnt {
   // the movements of the current line, read in MIRVAL; false when the import failed,
   // which ends the lines. By default: nothing for a zero HT, else the excluding-tax
   // movement and, when the line bears VAT, its VAT movement;
-  virtual bool envoyerLigne();
+  virtual bool sendLine();
   // what stands after the lines; false when the import failed, which ends it. By
   // default the tiers movement on the header account with its due date;
-  virtual bool envoyerContrepartie();
+  virtual bool sendCounterpart();
   // what follows the import of the piece, whatever its outcome. By default nothing.
-  virtual void apresPiece() {}
+  virtual void afterPiece() {}
 
-  // Registers the branch table in its order. `contrepartie` names the procedure that
+  // Registers the branch table in its order. `counterpart` names the procedure that
   // writes the counterpart row, registered with the due-date row after it; nullptr
   // when the kind's piece has neither.
-  void enregistrerBranches(const char* contrepartie);
+  void registerBranches(const char* counterpart);
 
   // Steps the kinds build their rules from.
   // Runs one of the automaton's own procedures.
@@ -89,14 +89,14 @@ class PostingProcess : public model::Traitmnt {
   void lireCompte(const Donnee& numcp);
   // The excluding-tax movement of the current line with its analytic rows; its
   // identifier goes into MIRVAL.MOUVE_UNIQ.
-  bool envoyerMouvementHt();
+  bool sendExcludingTaxMovement();
   // The VAT movement of the current line on the account of its VAT code (vatAccount).
-  bool envoyerTvaDuCode();
+  bool sendVatOfCode();
   // A movement in the VAT form (line TVA on the line's side) on V_NUMCP.
-  bool envoyerMouvementTva();
+  bool sendVatMovement();
   // The sales VAT account of the line's code: by the dossier's PMTVA, then by the line
   // account's TPTVA ("E" receipts, "D" debits), then by `otherwise`.
-  Valeur compteTvaCollectee(VatBasis otherwise);
+  Valeur salesVatAccount(VatBasis otherwise);
 
   // Variables.
   Chaine P_IDENT{"P_IDENT", "", "", 0, this};

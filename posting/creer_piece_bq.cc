@@ -2,9 +2,9 @@
 
 MIRVAECreer_piece_bq::MIRVAECreer_piece_bq(host::Evt* e) : MIRVAECreer_piece_bq(e, 4, "CREER_LIGNE_BANQUE") {}
 
-MIRVAECreer_piece_bq::MIRVAECreer_piece_bq(host::Evt* e, int kind, const char* contrepartie)
-    : PostingProcess(e, registry::operationKind(kind)), contrepartie_(contrepartie) {
-  enregistrerBranches(contrepartie);
+MIRVAECreer_piece_bq::MIRVAECreer_piece_bq(host::Evt* e, int kind, const char* counterpart)
+    : PostingProcess(e, registry::operationKind(kind)), counterpart_(counterpart) {
+  registerBranches(counterpart);
   addBranch("FAIT_JUSTIFICATION", &MIRVAECreer_piece_bq::fait_justification);
 }
 
@@ -14,19 +14,19 @@ posting::Side MIRVAECreer_piece_bq::lineSide() {
 
 host::Valeur MIRVAECreer_piece_bq::vatAccount() {
   if (MIRVAE_TYPE_DR == "D") return CDTVA_DETVA.valeur();
-  return compteTvaCollectee(posting::VatBasis::Debits);
+  return salesVatAccount(posting::VatBasis::Debits);
 }
 
-bool MIRVAECreer_piece_bq::envoyerContrepartie() {
+bool MIRVAECreer_piece_bq::sendCounterpart() {
   lireCompte(MIRVAE_NUMCP);
-  procedure(contrepartie_);
+  procedure(counterpart_);
   if (!importer("DEBUT_LIGNE")) return false;
   if (!importer("FIN_LIGNE")) return false;
   MOUVE_IMM.raz('N');
   return true;
 }
 
-void MIRVAECreer_piece_bq::apresPiece() { procedure("FAIT_JUSTIFICATION"); }
+void MIRVAECreer_piece_bq::afterPiece() { procedure("FAIT_JUSTIFICATION"); }
 
 void MIRVAECreer_piece_bq::fait_justification(host::Evt*) {}
 

@@ -21,21 +21,21 @@ class MIRVAECreer_piece_bq : public posting::PostingProcess {
   void fait_justification(host::Evt* e);
 
  protected:
-  // For the cash operation, which posts the same way; `contrepartie` names the
+  // For the cash operation, which posts the same way; `counterpart` names the
   // procedure that writes the counterpart row.
-  MIRVAECreer_piece_bq(host::Evt* e, int kind, const char* contrepartie);
+  MIRVAECreer_piece_bq(host::Evt* e, int kind, const char* counterpart);
 
   posting::Side lineSide() override;
   // A payment takes the deductible VAT; a receipt the sales VAT by the dossier's basis,
   // then the line account's, owed on debits when neither says.
   host::Valeur vatAccount() override;
-  bool envoyerContrepartie() override;
-  void apresPiece() override;
+  bool sendCounterpart() override;
+  void afterPiece() override;
 
   host::Champ MIRVAE_TYPE_DR{this, "TYPE_DR", table(false)};
 
  private:
-  const char* contrepartie_;
+  const char* counterpart_;
 };
 
 class MIRVAECreer_piece_ca : public MIRVAECreer_piece_bq {

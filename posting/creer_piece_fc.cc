@@ -1,5 +1,5 @@
 #include "posting/creer_piece_fc.h"
 
 MIRVAECreer_piece_fc::MIRVAECreer_piece_fc(host::Evt* e) : PostingProcess(e, registry::operationKind(1)) {
-  enregistrerBranches("CREER_LIGNE_TIERS");
+  registerBranches("CREER_LIGNE_TIERS");
 }

@@ -12,5 +12,5 @@ class MIRVAECreer_piece_fc : public posting::PostingProcess {
   // Revenue and VAT on credit, the client on debit.
   posting::Side lineSide() override { return posting::Side::Credit; }
   // Sales VAT, owed on receipts unless the dossier or the line account says debits.
-  host::Valeur vatAccount() override { return compteTvaCollectee(posting::VatBasis::Receipts); }
+  host::Valeur vatAccount() override { return salesVatAccount(posting::VatBasis::Receipts); }
 };

@@ -21,8 +21,8 @@ class MIRVAECreer_piece_od : public posting::PostingProcess {
   // A line is posted unless all its amounts are zero. A line on a VAT account makes
   // one movement of its VAT amount on that account; any other line makes its
   // excluding-tax movement, even of zero, and its VAT movement when it bears VAT.
-  bool envoyerLigne() override;
-  bool envoyerContrepartie() override { return true; }
+  bool sendLine() override;
+  bool sendCounterpart() override { return true; }
 
   host::Champ MIRVAL_SENS_DC{"SENS_DC", &MIRVAL};
   host::Champ MIRVAL_TTC{"TTC", &MIRVAL};

@@ -146,10 +146,6 @@ TEST_F(CreerPieceTest, EachKindPostsItsSidesAccountsAndDueDate) {
        {.type = "CA", .lignes = {{"606400", "30", "6", "A20"}}, .numcp = "530000", .numjl = "CA", .typeDr = "D"},
        {"606400 D 30.00", "445660 D 6.00", "530000 C 36.00"},
        ""},
-      {"cash receipt",
-       {.type = "CA", .lignes = {{"758000", "40"}}, .numcp = "530000", .numjl = "CA", .typeDr = "R"},
-       {"758000 C 40.00", "530000 D 40.00"},
-       ""},
       // Each line on its own side; a VAT account takes the VAT amount; a line of only
       // a TTC makes a movement of zero; a line of no amount makes none.
       {"miscellaneous operation",
