@@ -21,6 +21,21 @@ PostingProcess::PostingProcess(Evt* e, const registry::OperationKind& kind) : Tr
   lancement()->param(0, P_IDENT, 0);
 }
 
+void PostingProcess::registerBranches(const char* counterpart) {
+  addBranch("DEBUT", &PostingProcess::debut);
+  addBranch("FAIRE", &PostingProcess::faire);
+  addBranch("FAIT_IMPORT_PIECE", &PostingProcess::fait_import_piece);
+  addBranch("CREER_ENTETE", &PostingProcess::creer_entete);
+  addBranch("CREER_LIGNE_HT", &PostingProcess::creer_ligne_ht);
+  addBranch("CREER_LIGNE_TVA", &PostingProcess::creer_ligne_tva);
+  if (counterpart) {
+    addBranch(counterpart, &PostingProcess::creer_ligne_tiers);
+    addBranch("CREER_ECHEANCE", &PostingProcess::creer_echeance);
+  }
+  addBranch("CREER_ANALYTIQUE", &PostingProcess::creer_analytique);
+  addBranch("TRAITER_ERREUR", &PostingProcess::traiter_erreur);
+}
+
 // ---------------------------------------------------------------------------- cycle
 
 void PostingProcess::debut(Evt* e) {
@@ -38,6 +53,7 @@ void PostingProcess::faire(Evt* e) {
       V_FLAG_E = 1;
     } else {
       procedure("FAIT_IMPORT_PIECE");
+      afterPiece();
     }
   }
   sortir(e, 0);
@@ -61,15 +77,7 @@ void PostingProcess::fait_import_piece(Evt*) {
   table(false)->ecrit();
 
   envoyerLignes();
-
-  lireCompte(MIRVAE_NUMCP);
-  procedure(counterpartProcedure());
-  if (!importer("DEBUT_LIGNE")) return;
-  procedure("CREER_ECHEANCE");
-  if (!importer("ECHEANCE")) return;
-  if (!importer("FIN_LIGNE")) return;
-  MOUVE_IMM.raz('N');
-  viderTransfert(ECHEA_IMM, ECHEA_IMM_NINST);
+  if (!sendCounterpart()) return;
 
   Chaine valider("O");
   EvtParamRef fin(1, &valider);
@@ -90,28 +98,66 @@ void PostingProcess::envoyerLignes() {
   MIRVAL.initRequete();
   MIRVAL.ajouteFiltre(MIRVAL_NUMERO, '/', MIRVAE_IDENT + "|");
   MIRVAL.activeRequete();
-  for (int rc = MIRVAL.suivant(3); rc == 0; rc = MIRVAL.suivant(1)) {
-    // A line without an excluding-tax amount makes no movement at all, VAT included.
-    if (MIRVAL_HT.decimal().isZero()) continue;
-    lireCompte(MIRVAL_NUMCP);
-    procedure("CREER_LIGNE_HT");
-    EvtParamRef uniq(1, &V_MOUVE_UNIQ);
-    if (!importer("DEBUT_LIGNE", &uniq)) return;
-    MIRVAL_MOUVE_UNIQ = V_MOUVE_UNIQ;
-    MIRVAL.ecrit();
-    envoyerAnalytique();
-    if (!importer("FIN_LIGNE")) return;
-    MOUVE_IMM.raz('N');
+  for (int rc = MIRVAL.suivant(3); rc == 0; rc = MIRVAL.suivant(1))
+    if (!sendLine()) return;
+}
 
-    if (MIRVAL_TVA.decimal().isZero()) continue;
-    lireCompte(MIRVAL_NUMCP);
-    if (CDTVA.lit(3, CDTVA_COTVA, '=', MIRVAL_COTVA) != 0) CDTVA.raz();
-    V_NUMCP = vatAccount();
-    procedure("CREER_LIGNE_TVA");
-    if (!importer("DEBUT_LIGNE")) return;
-    if (!importer("FIN_LIGNE")) return;
-    MOUVE_IMM.raz('N');
+bool PostingProcess::sendLine() {
+  // A line without an excluding-tax amount makes no movement at all, VAT included.
+  if (MIRVAL_HT.decimal().isZero()) return true;
+  lireCompte(MIRVAL_NUMCP);
+  if (!sendExcludingTaxMovement()) return false;
+  return MIRVAL_TVA.decimal().isZero() || sendVatOfCode();
+}
+
+bool PostingProcess::sendCounterpart() {
+  lireCompte(MIRVAE_NUMCP);
+  procedure("CREER_LIGNE_TIERS");
+  if (!importer("DEBUT_LIGNE")) return false;
+  procedure("CREER_ECHEANCE");
+  if (!importer("ECHEANCE")) return false;
+  if (!importer("FIN_LIGNE")) return false;
+  MOUVE_IMM.raz('N');
+  viderTransfert(ECHEA_IMM, ECHEA_IMM_NINST);
+  return true;
+}
+
+bool PostingProcess::sendExcludingTaxMovement() {
+  procedure("CREER_LIGNE_HT");
+  EvtParamRef uniq(1, &V_MOUVE_UNIQ);
+  if (!importer("DEBUT_LIGNE", &uniq)) return false;
+  MIRVAL_MOUVE_UNIQ = V_MOUVE_UNIQ;
+  MIRVAL.ecrit();
+  envoyerAnalytique();
+  if (!importer("FIN_LIGNE")) return false;
+  MOUVE_IMM.raz('N');
+  return true;
+}
+
+bool PostingProcess::sendVatOfCode() {
+  lireCompte(MIRVAL_NUMCP);
+  if (CDTVA.lit(3, CDTVA_COTVA, '=', MIRVAL_COTVA) != 0) CDTVA.raz();
+  V_NUMCP = vatAccount();
+  return sendVatMovement();
+}
+
+bool PostingProcess::sendVatMovement() {
+  procedure("CREER_LIGNE_TVA");
+  if (!importer("DEBUT_LIGNE")) return false;
+  if (!importer("FIN_LIGNE")) return false;
+  MOUVE_IMM.raz('N');
+  return true;
+}
+
+Valeur PostingProcess::salesVatAccount(VatBasis otherwise) {
+  VatBasis owed = otherwise;
+  for (const Donnee* said : {static_cast<const Donnee*>(&PARAM_PMTVA), static_cast<const Donnee*>(&COMPT_TPTVA)}) {
+    if (*said == "E" || *said == "D") {
+      owed = *said == "E" ? VatBasis::Receipts : VatBasis::Debits;
+      break;
+    }
   }
+  return owed == VatBasis::Receipts ? CDTVA_CETVA.valeur() : CDTVA_CITVA.valeur();
 }
 
 // The analytic rows of the current line; a failure ends them, not the line.

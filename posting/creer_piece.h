@@ -17,9 +17,10 @@
 // the ledger's texts when the code is 10. The process never writes the ledger itself.
 //
 // What differs between the kinds of operation is data (their row of the operation-kind
-// table) and a few rules (the side of an amount, the VAT account, the procedure that
-// writes the counterpart), which each kind's class gives; each keeps its own name and
-// its own branch table. A process handed an operation of another kind refuses it.
+// table) and a few rules (the side of an amount, the VAT account, which movements a
+// line makes, what stands after the lines, what follows the piece), which each kind's
+// class gives; each keeps its own name and its own branch table. A process handed an
+// operation of another kind refuses it.
 #pragma once
 
 #include "host/decimal.h"
@@ -32,6 +33,9 @@ namespace posting {
 using namespace host;
 
 enum class Side { Debit, Credit };
+
+// What the sales VAT of a line is owed on: receipts (CDTVA.CETVA) or debits (CDTVA.CITVA).
+enum class VatBasis { Receipts, Debits };
 
 class PostingProcess : public model::Traitmnt {
  public:
@@ -52,15 +56,47 @@ class PostingProcess : public model::Traitmnt {
  protected:
   const registry::OperationKind& kind_;
 
-  // The kind's rules, read on the header and the line in the buffers:
-  // where a positive HT or VAT of the line goes (a negative one goes to the other
-  // side, and the counterpart takes the opposite of both);
+  // The kind's rules, asked again for each row and read on the header and the line
+  // in the buffers:
+  // where a positive HT or VAT of the current line goes (a negative one goes to the
+  // other side, and the counterpart takes the opposite of both);
   virtual Side lineSide() = 0;
-  // the VAT account of the line, from its VAT code (CDTVA), the dossier (PARAM) and
-  // the line's account (COMPT);
+  // the VAT account of the current line, from its VAT code (CDTVA), the dossier
+  // (PARAM) and the line's account (COMPT);
   virtual Valeur vatAccount() = 0;
-  // the procedure that writes the counterpart movement row.
-  virtual const char* counterpartProcedure() const = 0;
+  // the movements of the current line, read in MIRVAL; false when the import failed,
+  // which ends the lines. By default: nothing for a zero HT, else the excluding-tax
+  // movement and, when the line bears VAT, its VAT movement;
+  virtual bool sendLine();
+  // what stands after the lines; false when the import failed, which ends it. By
+  // default the tiers movement on the header account with its due date;
+  virtual bool sendCounterpart();
+  // what follows the import of the piece, whatever its outcome. By default nothing.
+  virtual void afterPiece() {}
+
+  // Registers the branch table in its order. `counterpart` names the procedure that
+  // writes the counterpart row, registered with the due-date row after it; nullptr
+  // when the kind's piece has neither.
+  void registerBranches(const char* counterpart);
+
+  // Steps the kinds build their rules from.
+  // Runs one of the automaton's own procedures.
+  void procedure(const char* name);
+  // Calls a procedure of the ledger's import component. On failure hands the code to
+  // "TRAITER_ERREUR", raises V_FLAG_E and returns false.
+  bool importer(const char* name, Evt* params = nullptr);
+  // Reads an account into COMPT, or clears the buffer when there is none.
+  void lireCompte(const Donnee& numcp);
+  // The excluding-tax movement of the current line with its analytic rows; its
+  // identifier goes into MIRVAL.MOUVE_UNIQ.
+  bool sendExcludingTaxMovement();
+  // The VAT movement of the current line on the account of its VAT code (vatAccount).
+  bool sendVatOfCode();
+  // A movement in the VAT form (line TVA on the line's side) on V_NUMCP.
+  bool sendVatMovement();
+  // The sales VAT account of the line's code: by the dossier's PMTVA, then by the line
+  // account's TPTVA ("E" receipts, "D" debits), then by `otherwise`.
+  Valeur salesVatAccount(VatBasis otherwise);
 
   // Variables.
   Chaine P_IDENT{"P_IDENT", "", "", 0, this};
@@ -116,6 +152,7 @@ class PostingProcess : public model::Traitmnt {
   Champ CDTVA_COTVA{"COTVA", &CDTVA};
   Champ CDTVA_CITVA{"CITVA", &CDTVA};
   Champ CDTVA_CETVA{"CETVA", &CDTVA};
+  Champ CDTVA_DETVA{"DETVA", &CDTVA};
   Champ PARAM_PNUME{"PNUME", &PARAM};
   Champ PARAM_PMTVA{"PMTVA", &PARAM};
   Champ PIECE_IMM_NINST{"NINST", &PIECE_IMM};
@@ -148,15 +185,8 @@ class PostingProcess : public model::Traitmnt {
   Champ VTSEC_IMM_MTACR{"MTACR", &VTSEC_IMM};
 
  private:
-  // Runs one of the automaton's own procedures.
-  void procedure(const char* name);
-  // Calls a procedure of the ledger's import component. On failure hands the code to
-  // "TRAITER_ERREUR", raises V_FLAG_E and returns false.
-  bool importer(const char* name, Evt* params = nullptr);
   void envoyerLignes();
   void envoyerAnalytique();
-  // Reads an account into COMPT, or clears the buffer when there is none.
-  void lireCompte(const Donnee& numcp);
   // Starts a transfer row: reset for a new row, blank buffer, instance number.
   void nouvelleLigne(Table& table, Champ& ninst);
   // Removes this import's rows from a transfer table.

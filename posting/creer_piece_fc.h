@@ -11,8 +11,6 @@ class MIRVAECreer_piece_fc : public posting::PostingProcess {
  protected:
   // Revenue and VAT on credit, the client on debit.
   posting::Side lineSide() override { return posting::Side::Credit; }
-  // Sales VAT: PARAM.PMTVA "D" takes CDTVA.CITVA, "E" CDTVA.CETVA; otherwise the line
-  // account's TPTVA decides ("D": CITVA, anything else: CETVA).
-  host::Valeur vatAccount() override;
-  const char* counterpartProcedure() const override { return "CREER_LIGNE_TIERS"; }
+  // Sales VAT, owed on receipts unless the dossier or the line account says debits.
+  host::Valeur vatAccount() override { return salesVatAccount(posting::VatBasis::Receipts); }
 };

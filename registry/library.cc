@@ -6,7 +6,10 @@
 #include "entry/gestion3.h"
 #include "host/registry.h"
 #include "host/value.h"
+#include "posting/creer_piece_bq.h"
 #include "posting/creer_piece_fc.h"
+#include "posting/creer_piece_ff.h"
+#include "posting/creer_piece_od.h"
 #include "posting/supprimer_piece.h"
 #include "posting/verifier_modif_piece.h"
 #include "printing/interface.h"
@@ -37,14 +40,31 @@ void declarerUnites() {
   static const Source postingSource("MIRVAE", nullptr);
 
   // Unit CREER_PIECE_FF, GESTION2.
-  static const Global supplierGlobal("MIRVAE", "MIRVAE");
+  static const Global creerPieceFfGlobal("MIRVAE", "MIRVAE");
+  static const Module creerPieceFf("", "MIRVAE-CREER_PIECE_FF", &host::fabriquer<MIRVAECreer_piece_ff>, false, "");
   static const Module gestion2("", "MIRVAE-GESTION2", &host::fabriquer<MIRVAEGestion2>, false, "");
-  static const Source supplierSource("MIRVAE", nullptr);
+  static const Source creerPieceFfSource("MIRVAE", nullptr);
 
   // Unit CREER_PIECE_NDF, GESTION3.
-  static const Global expenseGlobal("MIRVAE", "MIRVAE");
+  static const Global creerPieceNdfGlobal("MIRVAE", "MIRVAE");
+  static const Module creerPieceNdf("", "MIRVAE-CREER_PIECE_NDF", &host::fabriquer<MIRVAECreer_piece_ndf>, false, "");
   static const Module gestion3("", "MIRVAE-GESTION3", &host::fabriquer<MIRVAEGestion3>, false, "");
-  static const Source expenseSource("MIRVAE", nullptr);
+  static const Source creerPieceNdfSource("MIRVAE", nullptr);
+
+  // Unit CREER_PIECE_BQ, GESTION4.
+  static const Global creerPieceBqGlobal("MIRVAE", "MIRVAE");
+  static const Module creerPieceBq("", "MIRVAE-CREER_PIECE_BQ", &host::fabriquer<MIRVAECreer_piece_bq>, false, "");
+  static const Source creerPieceBqSource("MIRVAE", nullptr);
+
+  // Unit CREER_PIECE_CA, GESTION5.
+  static const Global creerPieceCaGlobal("MIRVAE", "MIRVAE");
+  static const Module creerPieceCa("", "MIRVAE-CREER_PIECE_CA", &host::fabriquer<MIRVAECreer_piece_ca>, false, "");
+  static const Source creerPieceCaSource("MIRVAE", nullptr);
+
+  // Unit CREER_PIECE_OD, GESTION6.
+  static const Global creerPieceOdGlobal("MIRVAE", "MIRVAE");
+  static const Module creerPieceOd("", "MIRVAE-CREER_PIECE_OD", &host::fabriquer<MIRVAECreer_piece_od>, false, "");
+  static const Source creerPieceOdSource("MIRVAE", nullptr);
 
   // Unit INTERFACE: it also works with the globals of the general-ledger library.
   static const Global interfaceComptaGlobal("COMPTA", "MIRVAE");

@@ -281,6 +281,11 @@ TEST_F(RegistreTest, UnitsDeclareInLoadOrder) {
       "Global MIRVAE", "Module MIRVAE-ACCES1", "Source MIRVAE",
       "Global MIRVAE", "Module MIRVAE-CREER_PIECE_FC", "Module MIRVAE-GESTION1", "Module MIRVAE-SUPPRIMER_PIECE",
       "Module MIRVAE-VERIFIER_MODIF_PIECE", "Source MIRVAE",
+      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_FF", "Module MIRVAE-GESTION2", "Source MIRVAE",
+      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_NDF", "Module MIRVAE-GESTION3", "Source MIRVAE",
+      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_BQ", "Source MIRVAE",
+      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_CA", "Source MIRVAE",
+      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_OD", "Source MIRVAE",
       "Global COMPTA", "Global MIRVAE", "Module MIRVAE-INTERFACE", "Source MIRVAE"};
   EXPECT_EQ(library, expected);
   for (const auto& d : host::Registre::instance().declarations())

@@ -57,9 +57,10 @@ void PostingTest::ecrire(const OperationEssai& op) {
     std::string order = std::to_string(i + 1);
     std::string ident = op.ident + "-" + order;
     inserer(base(),
-            "INSERT INTO MIRVAL (IDENT, NUMERO, NUMCP, LIBEC, COTVA, HT, TVA, TTC) VALUES (?, ?, ?, 'ligne', ?, ?, ?, ?)",
+            "INSERT INTO MIRVAL (IDENT, NUMERO, NUMCP, LIBEC, COTVA, HT, TVA, TTC, SENS_DC) "
+            "VALUES (?, ?, ?, 'ligne', ?, ?, ?, ?, ?)",
             {ident, op.ident + "|" + std::string(6 - order.size(), '0') + order, l.numcp, l.cotva, l.ht, l.tva,
-             (montant(l.ht) + montant(l.tva)).toString(0)});
+             l.ttc.empty() ? (montant(l.ht) + montant(l.tva)).toString(0) : l.ttc, l.sensDc});
     for (std::size_t a = 0; a < l.ventilation.size(); ++a)
       inserer(base(), "INSERT INTO MIRVAANA (IDENT, NUMERO, CSECT, MTADE, MTACR) VALUES (?, ?, ?, ?, ?)",
               {ident + "A" + std::to_string(a), ident + "|", l.ventilation[a][0], l.ventilation[a][1],
@@ -68,19 +69,19 @@ void PostingTest::ecrire(const OperationEssai& op) {
   std::string ttc = op.ttc.empty() ? (ht + tva).toString(0) : op.ttc;
   inserer(base(),
           "INSERT INTO MIRVAE (IDENT, TYPE, DTOPE, NUMCP, NUMJL, NPIEC, INPIE, NPIES, MONNAIE_IDENT, COURS, DTECH, "
-          "SAISIE_MTT, HT, TVA, TTC) VALUES (?, 'FC', ?, ?, ?, 'VT0042', 'Facture client n° VT0042', ?, ?, ?, "
-          "'2024-04-14', '1', ?, ?, ?)",
-          {op.ident, op.dtope, op.numcp, op.numjl, op.npies, op.monnaie, op.cours, ht.toString(0), tva.toString(0),
-           ttc});
+          "SAISIE_MTT, HT, TVA, TTC, TYPE_DR) VALUES (?, ?, ?, ?, ?, 'VT0042', 'Facture client n° VT0042', ?, ?, ?, "
+          "'2024-04-14', '1', ?, ?, ?, ?)",
+          {op.ident, op.type, op.dtope, op.numcp, op.numjl, op.npies, op.monnaie, op.cours, ht.toString(0),
+           tva.toString(0), ttc, op.typeDr});
 }
 
 void PostingTest::lancer(const char* module, host::Evt& evt) {
   session().action([&] { session().executer(host::Registre::instance().creer(module, &evt)); });
 }
 
-void PostingTest::poster(const std::string& ident) {
+void PostingTest::poster(const std::string& ident, const std::string& type) {
   host::EvtParamVal evt(1, ident);
-  lancer("MIRVAE-CREER_PIECE_FC", evt);
+  lancer(("MIRVAE-CREER_PIECE_" + type).c_str(), evt);
 }
 
 std::string PostingTest::npies(const std::string& ident) {

@@ -16,10 +16,13 @@ struct LigneEssai {
   std::string cotva = "";
   // Analytic rows of the line: section, debit, credit.
   std::vector<std::vector<std::string>> ventilation = {};
+  std::string sensDc = "";  // the line's own side, miscellaneous operations only
+  std::string ttc = "";     // HT + TVA when empty
 };
 
 struct OperationEssai {
   std::string ident = "OP000001";
+  std::string type = "FC";
   std::vector<LigneEssai> lignes;
   std::string ttc = "";  // the lines' total when empty
   std::string numcp = "411001";
@@ -28,6 +31,7 @@ struct OperationEssai {
   std::string monnaie = "EUR";
   std::string cours = "1";
   std::string npies = "";
+  std::string typeDr = "";  // bank and cash: "D" payment, "R" receipt
 };
 
 class PostingTest : public DossierTest {
@@ -37,8 +41,9 @@ class PostingTest : public DossierTest {
   void TearDown() override;
 
   void ecrire(const OperationEssai& op);
-  // Runs "MIRVAE-CREER_PIECE_FC" on the operation as one user action.
-  void poster(const std::string& ident = "OP000001");
+  // Runs the posting process of a kind ("MIRVAE-CREER_PIECE_" + type) on the
+  // operation as one user action.
+  void poster(const std::string& ident = "OP000001", const std::string& type = "FC");
   // Runs a module by name with a launch event, as one user action.
   void lancer(const char* module, host::Evt& evt);
   std::string npies(const std::string& ident = "OP000001");

@@ -1,11 +1,8 @@
-#include "posting/creer_piece_fc.h"
-
 #include <algorithm>
 #include <map>
 
 #include <gtest/gtest.h>
 
-#include "host/registry.h"
 #include "services/cppiece.h"
 #include "tests/posting/posting_fixture.h"
 #include "tests/support/library_double.h"
@@ -16,7 +13,7 @@ using testing_support::LigneEssai;
 using testing_support::OperationEssai;
 using Strings = std::vector<std::string>;
 
-class CreerPieceFcTest : public testing_support::PostingTest {
+class CreerPieceTest : public testing_support::PostingTest {
  protected:
   void echouer(const char* procedure, int occurrence, int code) {
     auto& hooks = services::importTestHooks();
@@ -29,7 +26,7 @@ class CreerPieceFcTest : public testing_support::PostingTest {
   testing_support::LibraryDouble import_{"CPPIECE-INTERFACE"};
 };
 
-TEST_F(CreerPieceFcTest, ClientInvoicePostsRowsAndCallsInOrder) {
+TEST_F(CreerPieceTest, ClientInvoicePostsRowsAndCallsInOrder) {
   ecrire({.lignes = {{"706000", "100", "20", "V20", {{"ATELIER", "0", "60"}, {"CHANTIER", "0", "40"}}},
                      {"707000", "50", "10", "V20"}}});
   poster();
@@ -69,7 +66,7 @@ struct LineCase {
   const char* dueAmount;
 };
 
-TEST_F(CreerPieceFcTest, LinesMakeTheirMovements) {
+TEST_F(CreerPieceTest, LinesMakeTheirMovements) {
   const LineCase cases[] = {
       {"HT zero: no movement, even with VAT",
        {.lignes = {{"706000", "0", "20", "V20"}, {"707000", "100", "20", "V20"}}, .ttc = "120"},
@@ -99,7 +96,7 @@ TEST_F(CreerPieceFcTest, LinesMakeTheirMovements) {
   EXPECT_TRUE(messages().empty());
 }
 
-TEST_F(CreerPieceFcTest, OnlyTheExcludingTaxMovementCarriesTheLineVatCodeAndAnalyticCodes) {
+TEST_F(CreerPieceTest, OnlyTheExcludingTaxMovementCarriesTheLineVatCodeAndAnalyticCodes) {
   ecrire({.lignes = {{"706000", "100", "20", "V20"}, {"707000", "-50", "-5", "V10"}}});
   base().exec("UPDATE MIRVAL SET CPOST = 'POSTE' || substr(IDENT, -1), CCRIT = 'CLE' || substr(IDENT, -1)");
   poster();
@@ -108,28 +105,141 @@ TEST_F(CreerPieceFcTest, OnlyTheExcludingTaxMovementCarriesTheLineVatCodeAndAnal
             "706000:V20:POSTE1:CLE1 445800::: 707000:V10:POSTE2:CLE2 445713::: 411001:::");
 }
 
-TEST_F(CreerPieceFcTest, VatAccountFollowsTheDossierThenTheLineAccount) {
-  struct Case {
-    const char* pmtva;
-    const char* account;  // 706000 owes its VAT on receipts, 707000 on debits, 707100 says nothing
-    const char* vatAccount;
-  } cases[] = {{"D", "706000", "445711"},
-               {"E", "707000", "445800"},
-               {"", "707000", "445711"},
-               {"", "706000", "445800"},
-               {"", "707100", "445800"}};
+// One hand-computed operation per kind, each with a line the other way round: the
+// sides, the VAT accounts, the counterpart and the due date of each kind.
+TEST_F(CreerPieceTest, EachKindPostsItsSidesAccountsAndDueDate) {
+  const struct {
+    const char* name;
+    OperationEssai operation;
+    Strings movements;
+    const char* dueDate;  // "ACCOUNT AMOUNT" of the due date, "" when the kind has none
+  } cases[] = {
+      {"client invoice",
+       {.lignes = {{"706000", "100", "20", "V20"}, {"707100", "-50", "-10", "V20"}}},
+       {"706000 C 100.00", "445800 C 20.00", "707100 D 50.00", "445800 D 10.00", "411001 D 60.00"},
+       "411001 60"},
+      {"supplier invoice: deductible VAT, even of a sales code",
+       {.type = "FF", .lignes = {{"601000", "100", "20", "A20"}, {"602200", "-50", "-10", "V20"}}, .numcp = "401001",
+        .numjl = "AC"},
+       {"601000 D 100.00", "445660 D 20.00", "602200 C 50.00", "445660 C 10.00", "401001 C 60.00"},
+       "401001 60"},
+      {"expense note: as the supplier invoice",
+       {.type = "NDF", .lignes = {{"601000", "100", "20", "A20"}, {"602200", "-50", "-10", "V20"}}, .numcp = "421001",
+        .numjl = "AC"},
+       {"601000 D 100.00", "445660 D 20.00", "602200 C 50.00", "445660 C 10.00", "421001 C 60.00"},
+       "421001 60"},
+      {"supplier credit note",
+       {.type = "FF", .lignes = {{"601000", "-100", "-20", "A20"}}, .numcp = "401001", .numjl = "AC"},
+       {"601000 C 100.00", "445660 C 20.00", "401001 D 120.00"},
+       "401001 120"},
+      {"bank receipt: sales VAT owed on debits unless said",
+       {.type = "BQ", .lignes = {{"706000", "100", "20", "V20"}, {"707100", "-50", "-10", "V20"}}, .numcp = "512100",
+        .numjl = "BQ1", .typeDr = "R"},
+       {"706000 C 100.00", "445800 C 20.00", "707100 D 50.00", "445711 D 10.00", "512100 D 60.00"},
+       ""},
+      {"bank payment: deductible VAT",
+       {.type = "BQ", .lignes = {{"601000", "100", "20", "V20"}, {"602200", "-50", "-10", "A20"}}, .numcp = "512100",
+        .numjl = "BQ1", .typeDr = "D"},
+       {"601000 D 100.00", "445660 D 20.00", "602200 C 50.00", "445660 C 10.00", "512100 C 60.00"},
+       ""},
+      {"cash payment",
+       {.type = "CA", .lignes = {{"606400", "30", "6", "A20"}}, .numcp = "530000", .numjl = "CA", .typeDr = "D"},
+       {"606400 D 30.00", "445660 D 6.00", "530000 C 36.00"},
+       ""},
+      // Each line on its own side; a VAT account takes the VAT amount; a line of only
+      // a TTC makes a movement of zero; a line of no amount makes none.
+      {"miscellaneous operation",
+       {.type = "OD",
+        .lignes = {{.numcp = "606100", .ht = "100", .tva = "20", .cotva = "A20", .sensDc = "D"},
+                   {.numcp = "445711", .ht = "0", .tva = "30", .sensDc = "C"},
+                   {.numcp = "658000", .ht = "0", .sensDc = "D", .ttc = "5"},
+                   {.numcp = "758000", .ht = "0", .sensDc = "C"},
+                   {.numcp = "512100", .ht = "90", .sensDc = "C"}},
+        .numcp = "",
+        .numjl = "OD"},
+       {"606100 D 100.00", "445660 D 20.00", "445711 C 30.00", "658000 D 0.00", "512100 C 90.00"},
+       ""},
+  };
   int n = 0;
-  for (const Case& c : cases) {
-    SCOPED_TRACE(std::string(c.pmtva) + " " + c.account);
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.name);
+    OperationEssai op = c.operation;
+    op.ident = "OP00000" + std::to_string(++n);
+    ecrire(op);
+    poster(op.ident, op.type);
+    std::string piece = npies(op.ident);
+    EXPECT_EQ(mouvements(piece), c.movements);
+    EXPECT_EQ(sql("SELECT MOUVE.NUMCP || ' ' || MTECH FROM ECHEA JOIN MOUVE ON MOUVE.UNIQ = ECHEA.UNIQ "
+                  "WHERE ECHEA.NPIES = '" + piece + "'"),
+              c.dueDate);
+  }
+  EXPECT_TRUE(messages().empty());
+}
+
+TEST_F(CreerPieceTest, VatAccountFollowsTheRuleOfEachKind) {
+  // PARAM.PMTVA; the line account (706000 owes its VAT on receipts, 707000 on debits,
+  // 707100 says nothing); the code's type (V20 sales, A20 purchases); the account taken
+  // in CDTVA (V20: CITVA 445711, CETVA 445800, DETVA 445660).
+  const struct {
+    const char* type;
+    const char* typeDr;
+    const char* pmtva;
+    const char* account;
+    const char* cotva;
+    const char* vatAccount;
+  } cases[] = {
+      {"FC", "", "D", "706000", "V20", "445711"}, {"FC", "", "E", "707000", "V20", "445800"},
+      {"FC", "", "", "707000", "V20", "445711"},  {"FC", "", "", "706000", "V20", "445800"},
+      {"FC", "", "", "707100", "V20", "445800"},  {"FF", "", "E", "707000", "V20", "445660"},
+      {"NDF", "", "D", "706000", "V20", "445660"}, {"BQ", "D", "E", "706000", "V20", "445660"},
+      {"BQ", "R", "E", "707000", "V20", "445800"}, {"CA", "R", "", "707100", "V20", "445711"},
+      {"OD", "", "E", "706000", "A20", "445660"}, {"OD", "", "E", "707000", "V20", "445800"},
+      {"OD", "", "D", "706000", "V20", "445711"}, {"OD", "", "", "706000", "V20", "445800"},
+      {"OD", "", "", "707100", "V20", "445711"},
+  };
+  int n = 0;
+  for (const auto& c : cases) {
+    SCOPED_TRACE(std::string(c.type) + c.typeDr + " " + c.pmtva + " " + c.account + " " + c.cotva);
     base().exec(std::string("UPDATE PARAM SET PMTVA = '") + c.pmtva + "'");
-    std::string ident = "OP00000" + std::to_string(++n);
-    ecrire({.ident = ident, .lignes = {{c.account, "100", "20", "V20"}}});
-    poster(ident);
-    EXPECT_EQ(mouvements(npies(ident))[1], std::string(c.vatAccount) + " C 20.00");
+    std::string type = c.type, ident = "OP0000" + std::to_string(10 + ++n);
+    OperationEssai op{.ident = ident,
+                      .type = type,
+                      .lignes = {{.numcp = c.account, .ht = "100", .tva = "20", .cotva = c.cotva, .sensDc = "C"}},
+                      .typeDr = c.typeDr};
+    if (type == "OD") op.lignes.push_back({.numcp = "512100", .ht = "120", .sensDc = "D"});
+    ecrire(op);
+    poster(ident, type);
+    Strings posted = mouvements(npies(ident));
+    ASSERT_GE(posted.size(), 2u);
+    EXPECT_EQ(posted[1].substr(0, 6), c.vatAccount);
   }
 }
 
-TEST_F(CreerPieceFcTest, FailedLineEndsTheLinesButNotThePiece) {
+TEST_F(CreerPieceTest, MiscellaneousOperation) {
+  // A line on a VAT account sends no analytic row, whatever the line holds.
+  ecrire({.type = "OD",
+          .lignes = {{.numcp = "445660", .ht = "0", .tva = "20", .ventilation = {{"ATELIER", "20", "0"}}, .sensDc = "D"},
+                     {.numcp = "512100", .ht = "20", .sensDc = "C"}},
+          .numcp = "",
+          .numjl = "OD"});
+  poster("OP000001", "OD");
+  EXPECT_EQ(appels_, (Strings{"DEBUT_IMPORT", "DEBUT_PIECE", "DEBUT_LIGNE 445660", "FIN_LIGNE", "DEBUT_LIGNE 512100",
+                              "FIN_LIGNE", "FIN_PIECE", "FIN_IMPORT"}));
+  EXPECT_EQ(compte("SELECT count(*) FROM VTSEC"), 0);
+
+  // Lines that do not balance never become a piece, and the user is told by how much.
+  ecrire({.ident = "OP000002",
+          .type = "OD",
+          .lignes = {{.numcp = "512100", .ht = "100", .sensDc = "D"}, {.numcp = "512200", .ht = "90", .sensDc = "C"}},
+          .numcp = "",
+          .numjl = "OD"});
+  poster("OP000002", "OD");
+  EXPECT_EQ(messages(), (Strings{"Erreur lors validation de la pièce :@La pièce n'est pas équilibrée : débit "
+                                 "100.00, crédit 90.00."}));
+  EXPECT_EQ(compte("SELECT count(*) FROM PIECE"), 1);
+}
+
+TEST_F(CreerPieceTest, FailedLineEndsTheLinesButNotThePiece) {
   ecrire({.lignes = {{"706000", "100", "20", "V20"}, {"707000", "100", "20", "V20"}, {"706100", "100", "20", "V20"}}});
   echouer("DEBUT_LIGNE", 3, 7);  // the second line's excluding-tax movement
   poster();
@@ -145,7 +255,7 @@ TEST_F(CreerPieceFcTest, FailedLineEndsTheLinesButNotThePiece) {
   EXPECT_EQ(compte("SELECT count(*) FROM MOUVE"), 0);
 }
 
-TEST_F(CreerPieceFcTest, AFailedAnalyticRowEndsItsLineAndAFailedDueDateEndsThePiece) {
+TEST_F(CreerPieceTest, AFailedAnalyticRowEndsItsLineAndAFailedDueDateEndsThePiece) {
   const struct {
     const char* procedure;
     Strings tail;  // the calls from the failed one on
@@ -173,7 +283,7 @@ TEST_F(CreerPieceFcTest, AFailedAnalyticRowEndsItsLineAndAFailedDueDateEndsThePi
   }
 }
 
-TEST_F(CreerPieceFcTest, TheDueDateHangsOnTheTiersMovementOfItsOwnPiece) {
+TEST_F(CreerPieceTest, TheDueDateHangsOnTheTiersMovementOfItsOwnPiece) {
   ecrire({.ident = "OP000001", .lignes = {{"706000", "100"}}});
   poster("OP000001");
   ecrire({.ident = "OP000002", .lignes = {{"706000", "50"}, {"707000", "30"}}});
@@ -185,7 +295,7 @@ TEST_F(CreerPieceFcTest, TheDueDateHangsOnTheTiersMovementOfItsOwnPiece) {
   EXPECT_NE(sql("SELECT INDX1 FROM ECHEA WHERE NPIES = '" + second + "'"), "1");
 }
 
-TEST_F(CreerPieceFcTest, TheProcessClearsOutTheTransferRowsOnceTheyAreConsumed) {
+TEST_F(CreerPieceTest, TheProcessClearsOutTheTransferRowsOnceTheyAreConsumed) {
   // The component's own end of the import would hide whether the process clears out
   // after itself: that end is put off until the user action ends.
   auto rows = [this] {
@@ -217,7 +327,7 @@ TEST_F(CreerPieceFcTest, TheProcessClearsOutTheTransferRowsOnceTheyAreConsumed) 
   EXPECT_EQ(compte("SELECT count(*) FROM PIECE"), 1);
 }
 
-TEST_F(CreerPieceFcTest, NpiesReplacedAsSoonAsDebutPieceSucceeds) {
+TEST_F(CreerPieceTest, NpiesReplacedAsSoonAsDebutPieceSucceeds) {
   ecrire({.lignes = {{"706000", "100", "20", "V20"}}, .npies = "00000000999"});
   std::string seenAtFirstLine;
   services::importTestHooks().onCall = [&](const std::string& procedure, const std::string&) {
@@ -236,7 +346,7 @@ TEST_F(CreerPieceFcTest, NpiesReplacedAsSoonAsDebutPieceSucceeds) {
   EXPECT_EQ(npies("OP000002"), "00000000999");
 }
 
-TEST_F(CreerPieceFcTest, LedgerUnreachableStopsWithOneMessage) {
+TEST_F(CreerPieceTest, LedgerUnreachableStopsWithOneMessage) {
   ecrire({.lignes = {{"706000", "100", "20", "V20"}}});
   echouer("DEBUT_IMPORT", 1, 1);
   poster();
@@ -245,7 +355,7 @@ TEST_F(CreerPieceFcTest, LedgerUnreachableStopsWithOneMessage) {
   EXPECT_EQ(npies(), "");
 }
 
-TEST_F(CreerPieceFcTest, ErrorTextsShownOneBoxEachForCodeTenOnly) {
+TEST_F(CreerPieceTest, ErrorTextsShownOneBoxEachForCodeTenOnly) {
   // Refused by the ledger (code 10): one box per text, in the ledger's order.
   ecrire({.lignes = {{"709999", "100"}}, .numjl = "ZZ"});
   poster();
@@ -262,7 +372,7 @@ TEST_F(CreerPieceFcTest, ErrorTextsShownOneBoxEachForCodeTenOnly) {
   EXPECT_EQ(appels_.back(), "FIN_PIECE");
 }
 
-TEST_F(CreerPieceFcTest, MissingHeaderOrParametersOrAnotherKindPostNothing) {
+TEST_F(CreerPieceTest, MissingHeaderOrParametersOrAnotherKindPostNothing) {
   poster("INCONNU");
   EXPECT_TRUE(appels_.empty());
   // A supplier invoice handed to the client-invoice posting would post reversed.
@@ -280,26 +390,6 @@ TEST_F(CreerPieceFcTest, MissingHeaderOrParametersOrAnotherKindPostNothing) {
   poster();
   EXPECT_TRUE(appels_.empty());
   EXPECT_EQ(npies(), "");
-}
-
-TEST_F(CreerPieceFcTest, RegisteredInItsUnitBetweenGlobalAndSource) {
-  const auto& all = host::Registre::instance().declarations();
-  auto at = [&](const char* name) {
-    for (std::size_t i = 0; i < all.size(); ++i)
-      if (all[i].sorte == host::Declaration::kModule && all[i].name == name) return i;
-    return all.size();
-  };
-  std::size_t creer = at("MIRVAE-CREER_PIECE_FC"), supprimer = at("MIRVAE-SUPPRIMER_PIECE"),
-              verifier = at("MIRVAE-VERIFIER_MODIF_PIECE");
-  ASSERT_LT(verifier, all.size());
-  ASSERT_GT(creer, 0u);
-  EXPECT_LT(creer, supprimer);
-  EXPECT_LT(supprimer, verifier);
-  EXPECT_EQ(all[creer - 1].sorte, host::Declaration::kGlobal);
-  EXPECT_EQ(all[creer - 1].name, "MIRVAE");
-  EXPECT_EQ(all[verifier + 1].sorte, host::Declaration::kSource);
-  EXPECT_EQ(all[verifier + 1].name, "MIRVAE");
-  EXPECT_EQ(all[creer].label, "");
 }
 
 }  // namespace
