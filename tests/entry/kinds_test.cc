@@ -9,6 +9,7 @@
 
 namespace {
 
+using registry::operationKind;
 using testing_support::Gestion1Test;
 
 class KindsTest : public Gestion1Test {};
@@ -134,6 +135,35 @@ TEST_F(KindsTest, AnExpenseLineIsLabelledByItsTypeOrByTheLineBefore) {
   user_.ajouterChoix("Réceptions");
   ASSERT_TRUE(model::ouvrirChoix(session(), "LST_MIRVAL.NUMCP"));
   EXPECT_EQ(session().transcript().textes("choix").back(), "Comptes de nature H commençant par 625");
+}
+
+TEST_F(KindsTest, AnExpenseNoteAndASupplierInvoiceOfTheSameLinesPostTheSameMovements) {
+  // Charges and deductible VAT on the debit, a credit note's on the credit, the
+  // counterparty on the credit for what is left: 120 - 44.
+  const struct {
+    int kind;
+    const char *header, *account;
+  } cases[] = {{2, "Scierie Maurel Frères", "401001"}, {3, "Bonnefon Lucas", "421001"}};
+  std::vector<std::string> posted;
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.kind);
+    kind_ = c.kind;
+    ASSERT_TRUE(creer());
+    ASSERT_TRUE(client(c.header));
+    ASSERT_TRUE(ligne("601000", "100", "A20"));
+    ASSERT_TRUE(ligne("625100", "-40", "A10"));
+    EXPECT_EQ(valeur("V_TOT_TTC"), "76.00");
+    ASSERT_TRUE(enregistrer());
+    std::string piece = sql("SELECT NPIES FROM MIRVAE WHERE TYPE = '" + std::string(operationKind(c.kind).type) + "'");
+    ASSERT_FALSE(piece.empty());
+    EXPECT_EQ(sql("SELECT MTCRES FROM MOUVE WHERE NPIES = '" + piece + "' AND NUMCP = '" + c.account + "'"), "76");
+    posted.push_back(sql("SELECT group_concat(NUMCP || ' ' || MTDEBS || ' ' || MTCRES, ', ') FROM (SELECT * FROM "
+                         "MOUVE WHERE NPIES = '" + piece + "' AND NUMCP <> '" + c.account + "' ORDER BY NUMCP, MTDEBS)"));
+    model::fermer(session());
+  }
+  EXPECT_EQ(posted[0], posted[1]);
+  EXPECT_EQ(posted[0], "445660 0 4, 445660 20 0, 601000 100 0, 625100 0 40");
+  EXPECT_TRUE(testing_support::incoherences(base()).empty());
 }
 
 }  // namespace
