@@ -6,12 +6,16 @@
 
 namespace browser {
 
+using namespace host;
+
 MIRVAEAcces::MIRVAEAcces(Evt* e, const registry::OperationKind& kind) : Acces2(e), kind_(kind) {
   nomBase("CP");
   nomLibelles("LIBE1", "LIBEL");
   nomEcran(kind_.accessScreen().c_str());
   nomTable("MIRVAE", nullptr);
+}
 
+void MIRVAEAcces::registerBranches(const std::function<void()>& accountBranches) {
   addBranch("INIT", &MIRVAEAcces::init);
   addBranch("DEBUT_ACTIVATION", &MIRVAEAcces::debut_activation);
   addBranch("ACTIVE_REQUETE", &MIRVAEAcces::active_requete);
@@ -24,9 +28,7 @@ MIRVAEAcces::MIRVAEAcces(Evt* e, const registry::OperationKind& kind) : Acces2(e
   addBranch("VDATE_DEBUT", &MIRVAEAcces::vdate_debut);
   addBranch("VDATE_FIN", &MIRVAEAcces::vdate_fin);
   addBranch("VIMPUT", &MIRVAEAcces::vimput);
-  addBranch("VNUMCP_TOUS", &MIRVAEAcces::vnumcp_tous);
-  addBranch("VLIBCP1", &MIRVAEAcces::vlibcp1);
-  addBranch("COMPT1_CHOISIR", &MIRVAEAcces::compt1_choisir);
+  accountBranches();
   addBranch("VNPIEC_TOUS", &MIRVAEAcces::vnpiec_tous);
   addBranch("VNPIEC", &MIRVAEAcces::vnpiec);
   addBranch("LST_LISTE_VIDE", &MIRVAEAcces::lst_liste_vide);
@@ -46,6 +48,12 @@ MIRVAEAcces::MIRVAEAcces(Evt* e, const registry::OperationKind& kind) : Acces2(e
 void MIRVAEAcces::messageOk(const std::string& text) {
   EvtParamRef evt(1, text);
   appelerProcedure("*", "CPMESSAG", "INTERFACE", "MESS_OK", &evt, -1);
+}
+
+void MIRVAEAcces::refuseInput(Evt* e, const std::string& message, const char* control) {
+  messageOk(message);
+  controler(control, "");
+  rejeter(e);
 }
 
 void MIRVAEAcces::quitter(Evt* e) {
@@ -121,13 +129,7 @@ void MIRVAEAcces::debut(Evt* e) {
   MEM04.activeRequete();
 
   appelerProcedure("", "", "", "CALCULER_DATES", nullptr, 0);
-  VNUMCP_TOUS = "O";
-
-  COMPT1.initRequete();
-  COMPT1.ajouteFiltre(COMPT1_NATUC, '?', kind_.headerNature, 'A');
-  COMPT1.ajouteFiltre(COMPT1_CCTRA, '#', "O", 'A');
-  COMPT1.choisitIndex("LIBCP", 'A');
-  COMPT1.activeRequete();
+  openAccounts();
 
   VNPIEC_TOUS = "O";
   Automate::debut(e);
@@ -150,7 +152,7 @@ void MIRVAEAcces::vmoian_selection(Evt*) {
 void MIRVAEAcces::vmoian(Evt*) {
   appelerProcedure("", "", "", "CALCULER_DATES", nullptr, 0);
   ecran()->affiche("GRP1", "");
-  appelerProcedure("", "", "", "ACTIVE_REQUETE", nullptr, 0);
+  requery();
 }
 
 void MIRVAEAcces::vmoian_ferme(Evt* e) { vmoian(e); }
@@ -175,12 +177,10 @@ void MIRVAEAcces::calculer_dates(Evt*) {
 
 void MIRVAEAcces::verifierBorne(Evt* e, Date& date, const char* start, const char* control) {
   if (date < VDATE_MIN || date > VDATE_MAX) {
-    messageOk(start + VDATE_MIN + " et le " + VDATE_MAX + " !");
-    controler(control, "");
-    rejeter(e);
+    refuseInput(e, start + VDATE_MIN + " et le " + VDATE_MAX + " !", control);
     return;
   }
-  appelerProcedure("", "", "", "ACTIVE_REQUETE", nullptr, 0);
+  requery();
 }
 
 void MIRVAEAcces::vdate_debut(Evt* e) {
@@ -193,51 +193,18 @@ void MIRVAEAcces::vdate_fin(Evt* e) {
 
 // ---------------------------------------------------------------------------- filters
 
-void MIRVAEAcces::vimput(Evt*) { appelerProcedure("", "", "", "ACTIVE_REQUETE", nullptr, 0); }
-
-void MIRVAEAcces::vnumcp_tous(Evt*) {
-  if (VNUMCP_TOUS == "O") {
-    VNUMCP1 = "";
-    VLIBCP1 = "";
-  }
-  ecran()->affiche("P1", "");
-  appelerProcedure("", "", "", "ACTIVE_REQUETE", nullptr, 0);
-}
-
-void MIRVAEAcces::vlibcp1(Evt* e) {
-  if (VLIBCP1 == "") {
-    VNUMCP1 = "";
-    VNUMCP_TOUS = "O";
-  } else {
-    if (COMPT1.lit(3, COMPT1_LIBCP, '=', VLIBCP1) != 0) {
-      messageOk(kind_.headerMissing);
-      controler("VLIBCP1", "");
-      rejeter(e);
-      return;
-    }
-    VNUMCP1 = COMPT1_NUMCP;
-    VNUMCP_TOUS = "";
-  }
-  ecran()->affiche("P1", "");
-  appelerProcedure("", "", "", "ACTIVE_REQUETE", nullptr, 0);
-}
-
-void MIRVAEAcces::compt1_choisir(Evt*) {
-  EvtParamRef evt(5, &VLIBCP1, &COMPT1_LIBCP, kind_.headerNature, "LIBCP", "N");
-  appelerProcedure("*", "CPCOMPT", "INTERFACE", "CHOIX_INTITULE_REDUIT", &evt, -1);
-  appelerProcedure("", "", "", "VLIBCP1", nullptr, 0);
-}
+void MIRVAEAcces::vimput(Evt*) { requery(); }
 
 void MIRVAEAcces::vnpiec(Evt*) {
   VNPIEC_TOUS = VNPIEC == "" ? "O" : "";
-  ecran()->affiche("P2", "");
-  appelerProcedure("", "", "", "ACTIVE_REQUETE", nullptr, 0);
+  ecran()->affiche(pieceGroup(), "");
+  requery();
 }
 
 void MIRVAEAcces::vnpiec_tous(Evt*) {
   if (VNPIEC_TOUS == "O") VNPIEC = "";
-  ecran()->affiche("P2", "");
-  appelerProcedure("", "", "", "ACTIVE_REQUETE", nullptr, 0);
+  ecran()->affiche(pieceGroup(), "");
+  requery();
 }
 
 // ---------------------------------------------------------------------------- list
@@ -249,14 +216,14 @@ void MIRVAEAcces::active_requete(Evt* e) {
   main.ajouteFiltre(TYPE, '=', kind_.type, 'A');
   if (VDATE_DEBUT) main.ajouteFiltre(DTOPE, '+', VDATE_DEBUT, 'A');
   if (VDATE_FIN) main.ajouteFiltre(DTOPE, '-', VDATE_FIN, 'A');
-  if (VNUMCP1) main.ajouteFiltre(NUMCP, '=', VNUMCP1, 'A');
+  filterOnAccounts(main);
   if (VNPIEC) main.ajouteFiltre(NPIEC, '=', VNPIEC, 'A');
   main.choisitIndex("INDX1", 'A');
   main.activeRequete();
   ecran()->affiche("LST", "");
 }
 
-void MIRVAEAcces::debut_activation(Evt*) { appelerProcedure("", "", "", "ACTIVE_REQUETE", nullptr, 0); }
+void MIRVAEAcces::debut_activation(Evt*) { requery(); }
 
 void MIRVAEAcces::lst_selection(Evt* e) {
   if (PIECE.lit(3, PIECE_NPIES, '=', NPIES) != 0) {
@@ -269,12 +236,13 @@ void MIRVAEAcces::lst_selection(Evt* e) {
     rejeter(e);
     return;
   }
-  if (COMPT2.lit(3, COMPT2_NUMCP, '=', NUMCP) == 0) {
-    VLIBCP2 = COMPT2_LIBCP;
-  } else {
-    COMPT2.raz();
-    VLIBCP2 = kind_.rowUnknownTitle + NUMCP + "> inexistant !";
-  }
+  describeRow(e);
+}
+
+std::string MIRVAEAcces::rowAccountTitle(Table& accounts, Champ& number, Champ& title) {
+  if (accounts.lit(3, number, '=', NUMCP) == 0) return title.chaine();
+  accounts.raz();
+  return kind_.rowUnknownTitle + NUMCP + "> inexistant !";
 }
 
 void MIRVAEAcces::lst_liste_vide(Evt*) { ecran()->interdit("GERER", "MODIFIER", "VISU_PIECE", ""); }

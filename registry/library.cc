@@ -30,6 +30,31 @@ void declarerUnites() {
   static const Module acces1("", "MIRVAE-ACCES1", &host::fabriquer<browser::MIRVAEAcces1>, false, "");
   static const Source acces1Source("MIRVAE", nullptr);
 
+  // Unit ACCES2.
+  static const Global acces2Global("MIRVAE", "MIRVAE");
+  static const Module acces2("", "MIRVAE-ACCES2", &host::fabriquer<browser::MIRVAEAcces2>, false, "");
+  static const Source acces2Source("MIRVAE", nullptr);
+
+  // Unit ACCES3.
+  static const Global acces3Global("MIRVAE", "MIRVAE");
+  static const Module acces3("", "MIRVAE-ACCES3", &host::fabriquer<browser::MIRVAEAcces3>, false, "");
+  static const Source acces3Source("MIRVAE", nullptr);
+
+  // Unit ACCES4.
+  static const Global acces4Global("MIRVAE", "MIRVAE");
+  static const Module acces4("", "MIRVAE-ACCES4", &host::fabriquer<browser::MIRVAEAcces4>, false, "");
+  static const Source acces4Source("MIRVAE", nullptr);
+
+  // Unit ACCES5.
+  static const Global acces5Global("MIRVAE", "MIRVAE");
+  static const Module acces5("", "MIRVAE-ACCES5", &host::fabriquer<browser::MIRVAEAcces5>, false, "");
+  static const Source acces5Source("MIRVAE", nullptr);
+
+  // Unit ACCES6.
+  static const Global acces6Global("MIRVAE", "MIRVAE");
+  static const Module acces6("", "MIRVAE-ACCES6", &host::fabriquer<browser::MIRVAEAcces6>, false, "");
+  static const Source acces6Source("MIRVAE", nullptr);
+
   // Unit CREER_PIECE_FC, GESTION1, SUPPRIMER_PIECE, VERIFIER_MODIF_PIECE.
   static const Global postingGlobal("MIRVAE", "MIRVAE");
   static const Module creerPieceFc("", "MIRVAE-CREER_PIECE_FC", &host::fabriquer<MIRVAECreer_piece_fc>, false, "");

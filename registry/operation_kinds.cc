@@ -158,4 +158,9 @@ const OperationKind& operationKind(int number) {
   throw host::HostError("type d'opération « " + std::to_string(number) + " » inconnu (1 à 6 attendu)");
 }
 
+ShownBalance shownBalance(const host::Decimal& debitMinusCredit) {
+  if (debitMinusCredit < host::Decimal()) return {-debitMinusCredit, "C"};
+  return {debitMinusCredit, debitMinusCredit.isZero() ? "" : "D"};
+}
+
 }  // namespace registry

@@ -9,6 +9,8 @@
 #include <array>
 #include <string>
 
+#include "host/decimal.h"
+
 namespace registry {
 
 // Currency proposed to a new operation.
@@ -73,5 +75,14 @@ struct OperationKind {
 
 // The row of kind `number` (1 to 6); HostError for any other number.
 const OperationKind& operationKind(int number);
+
+// A bank or cash account's balance as the treasury screens show it: the amount
+// without its sign, and its side, "D" for a debit balance, "C" for a credit one, ""
+// when it is zero.
+struct ShownBalance {
+  host::Decimal amount;
+  const char* side;
+};
+ShownBalance shownBalance(const host::Decimal& debitMinusCredit);
 
 }  // namespace registry
