@@ -148,7 +148,6 @@ void EntryScreen::provide(Handlers& handlers) {
   handlers.add("APRES_SUPPRESSION_LIGNE", this, &EntryScreen::apres_suppression_ligne);
   handlers.add("BT_ANALYTIQUE", this, &EntryScreen::bt_analytique);
   handlers.add("APPEL_ANALYTIQUE", this, &EntryScreen::appel_analytique);
-  handlers.add("CALCUL_TOTAUX", this, &EntryScreen::calcul_totaux);
   handlers.add("EXTRACTION_DONNEES", this, &EntryScreen::extraction_donnees);
   handlers.add("EXTRACTION_TABLE_MIRVAANA", this, &EntryScreen::extraction_table_mirvaana);
   handlers.add("SUPPRESSION_DONNEES", this, &EntryScreen::suppression_donnees);
@@ -329,7 +328,7 @@ void EntryScreen::debut(Evt* e) {
   }
 
   COMPT2.initRequete();
-  COMPT2.ajouteFiltre(COMPT2_NATUC, '?', kind_.lineNature);
+  COMPT2.ajouteFiltre(COMPT2_NATUC, '?', lineNature());
   COMPT2.ajouteFiltre(COMPT2_CCTRA, '#', "O");
   COMPT2.choisitIndex("NUMCP");
   COMPT2.activeRequete();
@@ -546,9 +545,12 @@ void EntryScreen::validation(Evt* e) {
       return;
     }
   }
-  MIRVAE_HT = V_TOT_HT;
-  MIRVAE_TVA = V_TOT_TVA;
-  MIRVAE_TTC = V_TOT_TTC;
+  for (Part* part : parts_)
+    if (!part->documentAccepted(e)) {
+      rejeter(e);
+      return;
+    }
+  for (Part* part : parts_) part->saving();
   if (enCreation()) {
     MIRVAE_DATEC = Date::dateCourante();
     MIRVAE_HEUREC = Date::heureCourante();

@@ -94,6 +94,17 @@ class Part {
   virtual bool chooses(const std::string& /*control*/) { return false; }
   // Takes the account of an entry model's line as its own: false when it does not.
   virtual bool takesModelAccount(const std::string& /*account*/) { return false; }
+  // The account of the line typed or chosen, before it is checked: false once `e` is refused.
+  virtual bool lineAccountAccepted(Evt* /*e*/, const std::string& /*account*/) { return true; }
+  // The account of the line was read into COMPT2 and the line completed from it.
+  virtual void lineAccountRead() {}
+  // The checks of the lines as a whole ("CONTROLER_LST"): false once `e` is refused.
+  virtual bool linesAccepted(Evt* /*e*/) { return true; }
+  // The checks that follow those of the header and the lines at validation: false
+  // once `e` is refused.
+  virtual bool documentAccepted(Evt* /*e*/) { return true; }
+  // The header is about to be saved: the part writes what it totals into it.
+  virtual void saving() {}
 
  protected:
   EntryScreen& s_;
@@ -116,6 +127,10 @@ class EntryScreen : public model::Gestion_document2 {
   virtual bool lineOnDebit() = 0;
   // The label of a new operation whose journal gives no label prefix.
   virtual std::string defaultLabel() { return kind_.defaultLabel; }
+  // The nature letters of a line account ("" any).
+  virtual std::string lineNature() { return kind_.lineNature; }
+  // The VAT type given to the VAT code choice window.
+  virtual std::string vatChoiceType() { return kind_.vatChoiceType; }
   // The core's own handlers.
   virtual void provide(Handlers& handlers);
 
@@ -201,7 +216,6 @@ class EntryScreen : public model::Gestion_document2 {
   void apres_suppression_ligne(Evt* e) override;
   void bt_analytique(Evt* e);
   void appel_analytique(Evt* e);
-  void calcul_totaux(Evt* e);
   void maj_lignes_memoire(Evt* e);
   void ctrl_choisir(Evt* e) override;
   void ctrl_ouvre(Evt* e) override;
@@ -271,6 +285,9 @@ class EntryScreen : public model::Gestion_document2 {
   void switchCurrency(const char* options);
   // Whether the document has lines in memory.
   bool hasLines();
+  // Hands each line of the document to `add`: the lines in memory or, when there are
+  // none, the saved ones (read through MIRVAL2, so that the line typed stays in MIRVAL).
+  void forEachLine(const std::function<void(Table& line)>& add);
   // Copies the analytic rows of source line `source` to the line in MIRVAL, each
   // amount through `atNewRate`.
   void copyAnalyticRows(const std::string& source, const std::function<Decimal(const Donnee&)>& atNewRate);
@@ -290,9 +307,6 @@ class EntryScreen : public model::Gestion_document2 {
   Chaine VLIBCP2{"VLIBCP2", "", "", 0, this};
   Monnaie V_HT{"V_HT", "", "", 0, this};
   Monnaie V_TTC{"V_TTC", "", "", 0, this};
-  Monnaie V_TOT_HT{"V_TOT_HT", "", "", 0, this};
-  Monnaie V_TOT_TVA{"V_TOT_TVA", "", "", 0, this};
-  Monnaie V_TOT_TTC{"V_TOT_TTC", "", "", 0, this};
   Date DATE_CLOTURE{"DATE_CLOTURE", "Date de clôture", "8", 0, this};
   Date DATE_DEBUT_NOUVEL_E{"DATE_DEBUT_NOUVEL_E", "Date de début du nouvel exercice", "8", 0, this};
   Entier TVA_GR_ACTIF{"TVA_GR_ACTIF", "Gestion TVA 0/1", "", 0, this};

@@ -14,4 +14,5 @@ class MIRVAEGestion1 : public entry::EntryScreen {
  private:
   entry::EntryModels models_{*this};
   entry::HeaderAccount header_{*this};
+  entry::VatTotals totals_{*this};
 };

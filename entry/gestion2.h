@@ -18,4 +18,5 @@ class MIRVAEGestion2 : public entry::EntryScreen {
  private:
   entry::EntryModels models_{*this};
   entry::HeaderAccount header_{*this};
+  entry::VatTotals totals_{*this};
 };

@@ -62,6 +62,7 @@ class MIRVAEGestion3 : public entry::EntryScreen {
   void provide(entry::Handlers& handlers) override;
 
   entry::StaffOrSupplier header_{*this};
+  entry::VatTotals totals_{*this};
   host::Table TYPFR{this, "", "TYPFR", ""};
   host::Champ TYPFR_CTYFR{"CTYFR", &TYPFR};
   host::Champ TYPFR_ITYFR{"ITYFR", &TYPFR};

@@ -92,7 +92,8 @@ void EntryScreen::controler_lst(Evt* e) {
   erreurMethode(1, e);
   MEM_MIRVAL.initRequete();
   if (MEM_MIRVAL.nombre() == 0) return refuser(e, "Aucune ligne n'a été saisie.@La validation est impossible !", "");
-  if (V_TOT_HT == 0) return refuser(e, "La saisie d'une pièce dont le total est nul n'est pas autorisée !", "");
+  for (Part* part : parts_)
+    if (!part->linesAccepted(e)) return;
   erreurMethode(0, e);
 }
 

@@ -111,7 +111,9 @@ void EntryScreen::lst_mirval_numcp(Evt* e) {
     afficherLigne();
     return;
   }
-  EvtParamVal controle(3, "NUMCP", &MIRVAL_NUMCP, kind_.lineNature);
+  for (Part* part : parts_)
+    if (!part->lineAccountAccepted(e, MIRVAL_NUMCP.chaine())) return;
+  EvtParamVal controle(3, "NUMCP", &MIRVAL_NUMCP, lineNature());
   procedure("CONTROLER_COMPT", &controle);
   if (erreurMethode() != 0 || COMPT2.lit(3, COMPT2_NUMCP, '=', MIRVAL_NUMCP) != 0) {
     controler("LST_MIRVAL.NUMCP");
@@ -128,7 +130,9 @@ void EntryScreen::lst_vlibcp2(Evt* e) {
     afficherLigne();
     return;
   }
-  EvtParamVal controle(3, "LIBCP", &VLIBCP2, kind_.lineNature);
+  for (Part* part : parts_)
+    if (!part->lineAccountAccepted(e, VLIBCP2.chaine())) return;
+  EvtParamVal controle(3, "LIBCP", &VLIBCP2, lineNature());
   procedure("CONTROLER_COMPT", &controle);
   if (erreurMethode() != 0 || COMPT2.lit(3, COMPT2_LIBCP, '=', VLIBCP2) != 0) {
     controler("LST_VLIBCP2");
@@ -156,6 +160,7 @@ void EntryScreen::completerLigne() {
   procedure("CALCUL_MTT_LIGNE");
   MIRVAL_CPOST = COMPT2_CPOST;
   MIRVAL_CCRIT = COMPT2_CCRIT;
+  for (Part* part : parts_) part->lineAccountRead();
   afficherLigne();
 }
 
@@ -173,9 +178,9 @@ void EntryScreen::compt2_choisir(Evt*) {
   Chaine pattern(kind_.lineAccountPattern);
   Donnee* start = *kind_.lineAccountPattern ? static_cast<Donnee*>(&pattern)
                                             : parNumero ? &COMPT2_NUMCP : &COMPT2_LIBCP;
-  EvtParamRef choix(5, &valeur, start, kind_.lineNature, colonne, "N");
+  EvtParamRef choix(5, &valeur, start, lineNature(), colonne, "N");
   appelerProcedure("*", "CPCOMPT", "INTERFACE", "CHOIX_INTITULE_REDUIT", &choix, -1);
-  EvtParamVal controle(3, colonne, &valeur, kind_.lineNature);
+  EvtParamVal controle(3, colonne, &valeur, lineNature());
   procedure("CONTROLER_COMPT", &controle);
   if (erreurMethode() != 0 || valeur.estVide()) {
     VNUMCP2 = "";
@@ -235,7 +240,7 @@ void EntryScreen::cdtva_choisir(Evt*) {
     return;
   }
   Chaine PERREUR("PERREUR", "", "", 4, this);
-  EvtParamRef choix(3, &MIRVAL_COTVA, &PERREUR, kind_.vatChoiceType);
+  EvtParamRef choix(3, &MIRVAL_COTVA, &PERREUR, vatChoiceType());
   appelerProcedure("*1", "CPCDTVA", "INTERFACE", "CHOIX", &choix, -1);
   EvtParamVal liste(1, "LST");
   procedure("CTRL_DEBUT_MODIF_LISTE", &liste);
@@ -334,34 +339,20 @@ void EntryScreen::maj_lignes_memoire(Evt*) {
   procedure("CALCUL_TOTAUX");
 }
 
-void EntryScreen::calcul_totaux(Evt*) {
-  Decimal ht, tva, ttc;
-  bool lignes = false;
+void EntryScreen::forEachLine(const std::function<void(Table& line)>& add) {
+  bool lines = false;
   MEM_MIRVAL.initRequete();
   MEM_MIRVAL.activeRequete();
   for (int rc = MEM_MIRVAL.suivant(3); rc == 0; rc = MEM_MIRVAL.suivant(1)) {
-    lignes = true;
-    ht += MEM_MIRVAL_HT.decimal();
-    tva += MEM_MIRVAL_TVA.decimal();
-    ttc += MEM_MIRVAL_TTC.decimal();
+    lines = true;
+    add(MEM_MIRVAL);
   }
-  if (!lignes) {
-    // The saved lines, read through a cursor of their own so that the line being
-    // typed stays in MIRVAL. The bar keeps a header without identifier from
-    // selecting every operation's lines.
-    MIRVAL2.initRequete();
-    MIRVAL2.ajouteFiltre(MIRVAL2_NUMERO, '/', MIRVAE_IDENT.chaine() + "|");
-    MIRVAL2.activeRequete();
-    for (int rc = MIRVAL2.suivant(3); rc == 0; rc = MIRVAL2.suivant(1)) {
-      ht += MIRVAL2_HT.decimal();
-      tva += MIRVAL2_TVA.decimal();
-      ttc += MIRVAL2_TTC.decimal();
-    }
-  }
-  V_TOT_HT = ht;
-  V_TOT_TVA = tva;
-  V_TOT_TTC = ttc;
-  ecran()->affiche("GRP_TOT", "");
+  if (lines) return;
+  // The bar keeps a header without identifier from selecting every operation's lines.
+  MIRVAL2.initRequete();
+  MIRVAL2.ajouteFiltre(MIRVAL2_NUMERO, '/', MIRVAE_IDENT.chaine() + "|");
+  MIRVAL2.activeRequete();
+  for (int rc = MIRVAL2.suivant(3); rc == 0; rc = MIRVAL2.suivant(1)) add(MIRVAL2);
 }
 
 // ---------------------------------------------------------------------------- analytic breakdown

@@ -117,7 +117,7 @@ void EntryModels::modte_generer(Evt*) {
     compt.initRequete();
     if (!found) continue;
     if (!EntryScreen::readAccountOfNature(s_.COMPT2, s_.COMPT2_NUMCP, s_.COMPT2_NATUC, s_.COMPT2_CCTRA,
-                                          s_.COMPT_NUMCP.chaine(), s_.kind().lineNature))
+                                          s_.COMPT_NUMCP.chaine(), s_.lineNature().c_str()))
       continue;
     addModelLine();
   }

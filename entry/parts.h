@@ -73,4 +73,40 @@ class EntryModels : public Part {
   void addModelLine();
 };
 
+// The totals of lines that carry VAT: excluding tax, VAT and including tax, shown in
+// "GRP_TOT" and saved into the header.
+class VatTotals : public Part {
+ public:
+  explicit VatTotals(EntryScreen& screen);
+
+  void provide(Handlers& handlers) override;
+  bool linesAccepted(Evt* e) override;
+  void saving() override;
+
+  void calcul_totaux(Evt* e);
+
+  Monnaie V_TOT_HT{"V_TOT_HT", "", "", 0, &s_};
+  Monnaie V_TOT_TVA{"V_TOT_TVA", "", "", 0, &s_};
+  Monnaie V_TOT_TTC{"V_TOT_TTC", "", "", 0, &s_};
+};
+
+// What bank, cash and miscellaneous operations share: the piece label chosen among
+// the dossier's standard labels, and the last check of the lines' accounts before
+// saving (an account left generic, gone from the chart, or closed to entries).
+class StandardLabels : public Part {
+ public:
+  explicit StandardLabels(EntryScreen& screen);
+
+  void provide(Handlers& handlers) override;
+  bool chooses(const std::string& control) override;
+  bool documentAccepted(Evt* e) override;
+
+  void typlb_choisir(Evt* e);
+  void tests_validation(Evt* e);
+
+  Table TYPLB{&s_, "", "TYPLB", ""};
+  Champ TYPLB_CTYLB{"CTYLB", &TYPLB};
+  Champ TYPLB_ITYLB{"ITYLB", &TYPLB};
+};
+
 }  // namespace entry

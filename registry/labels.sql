@@ -49,3 +49,8 @@ INSERT INTO "LIBEL" ("CODE", "TEXTE") VALUES
   ('NATURE_S', 'Effet à payer'),
   ('NATURE_T', 'TVA'),
   ('NATURE_U', 'Soumis à TVA');
+
+-- Memos shown on request beside a message
+INSERT INTO "LIBEL" ("CODE", "TEXTE") VALUES
+  ('MEMO1.TXT',
+   'Un compte interdit en saisie ne reçoit plus d''écriture.@Choisissez un autre compte pour cette ligne, ou levez l''interdiction sur la fiche du compte s''il doit de nouveau servir.');

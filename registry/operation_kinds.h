@@ -51,7 +51,6 @@ struct OperationKind {
   CreationJournal journal;
   CreationCurrency currency;
   CreationDueDate dueDate;
-  bool models;                // entry models offered (MODTE, MODLI)
   // Choices of the validation dialog of a creation; the leading digit is the answer.
   std::array<const char*, 4> choices;  // unused trailing entries are nullptr
   // Messages that name the header account.
