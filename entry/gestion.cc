@@ -521,15 +521,10 @@ void EntryScreen::validation(Evt* e) {
     for (const char* choice : kind_.choices)
       if (choice) choices.emplace_back(choice);
     V_CHOIX = BoiteDialogue("Attention", "Que désirez-vous faire ?", 2, choices);
-    if (V_CHOIX == "1") {
+    if (V_CHOIX == "1" || V_CHOIX == "3") {
       V_CREAT_ACTIF = 0;
-      V_IMPR_FICHE = 0;
     } else if (V_CHOIX == "2") {
       V_CREAT_ACTIF = 1;
-      V_IMPR_FICHE = 0;
-    } else if (V_CHOIX == "3") {
-      V_CREAT_ACTIF = 0;
-      V_IMPR_FICHE = 1;
     } else {
       controler("");
       rejeter(e);
@@ -588,8 +583,7 @@ void EntryScreen::apres_validation(Evt* e) {
         "La nouvelle pièce n'a pas pu être comptabilisée : la modification n'est pas enregistrée, "
         "l'ancienne pièce est conservée.");
   ecran()->affiche("P1", "GRP1", "LST", "GRP_TOT", "");
-  if (V_IMPR_FICHE == 1) procedure("IMPR_FICHE");
-  V_IMPR_FICHE = 0;
+  for (Part* part : parts_) part->saved();
 }
 
 void EntryScreen::avant_suppression(Evt* e) {

@@ -105,6 +105,8 @@ class Part {
   virtual bool documentAccepted(Evt* /*e*/) { return true; }
   // The header is about to be saved: the part writes what it totals into it.
   virtual void saving() {}
+  // The operation was saved and posted.
+  virtual void saved() {}
 
  protected:
   EntryScreen& s_;
@@ -329,7 +331,6 @@ class EntryScreen : public model::Gestion_document2 {
   Simple VTXTVA{"VTXTVA", "", "", 0, this};
   Entier ANA_O_N{"ANA_O_N", "Le compte peut-il supporter de l'analytique ?", "", 0, this};
   Entier V_CREAT_ACTIF{"V_CREAT_ACTIF", "", "", 0, this};
-  Entier V_IMPR_FICHE{"V_IMPR_FICHE", "", "", 0, this};
   Chaine V_CHOIX{"V_CHOIX", "", "", 0, this};
   Chaine V_INFO_FICHE{"V_INFO_FICHE", "", "", 0, this};
 

@@ -15,4 +15,5 @@ class MIRVAEGestion1 : public entry::EntryScreen {
   entry::EntryModels models_{*this};
   entry::HeaderAccount header_{*this};
   entry::VatTotals totals_{*this};
+  entry::PrintAfterSaving print_{*this};
 };

@@ -19,4 +19,5 @@ class MIRVAEGestion2 : public entry::EntryScreen {
   entry::EntryModels models_{*this};
   entry::HeaderAccount header_{*this};
   entry::VatTotals totals_{*this};
+  entry::PrintAfterSaving print_{*this};
 };

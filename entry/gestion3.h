@@ -63,6 +63,7 @@ class MIRVAEGestion3 : public entry::EntryScreen {
 
   entry::StaffOrSupplier header_{*this};
   entry::VatTotals totals_{*this};
+  entry::PrintAfterSaving print_{*this};
   host::Table TYPFR{this, "", "TYPFR", ""};
   host::Champ TYPFR_CTYFR{"CTYFR", &TYPFR};
   host::Champ TYPFR_ITYFR{"ITYFR", &TYPFR};

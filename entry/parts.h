@@ -73,6 +73,18 @@ class EntryModels : public Part {
   void addModelLine();
 };
 
+// The form printed after saving, when the user chose "3Enregistrer et ~Imprimer".
+class PrintAfterSaving : public Part {
+ public:
+  explicit PrintAfterSaving(EntryScreen& screen) : Part(screen) {}
+
+  void provide(Handlers&) override {}
+  void choiceMade(const std::string& choice) override { V_IMPR_FICHE = choice == "3" ? 1 : 0; }
+  void saved() override;
+
+  Entier V_IMPR_FICHE{"V_IMPR_FICHE", "", "", 0, &s_};
+};
+
 // The totals of lines that carry VAT: excluding tax, VAT and including tax, shown in
 // "GRP_TOT" and saved into the header.
 class VatTotals : public Part {

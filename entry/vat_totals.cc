@@ -2,6 +2,11 @@
 
 namespace entry {
 
+void PrintAfterSaving::saved() {
+  if (V_IMPR_FICHE == 1) s_.procedure("IMPR_FICHE");
+  V_IMPR_FICHE = 0;
+}
+
 VatTotals::VatTotals(EntryScreen& screen) : Part(screen) {}
 
 void VatTotals::provide(Handlers& handlers) { handlers.add("CALCUL_TOTAUX", this, &VatTotals::calcul_totaux); }
