@@ -1,4 +1,4 @@
-#include "entry/gestion.h"
+#include "entry/parts.h"
 
 #include <algorithm>
 #include <vector>
@@ -68,6 +68,11 @@ Automate::Handler Handlers::take(std::string_view name) {
 
 Part::Part(EntryScreen& screen) : s_(screen) { screen.parts_.push_back(this); }
 
+LineAccount& EntryScreen::line() {
+  if (!line_) throw HostError("l'écran « " + code() + " » n'a pas de compte de ligne");
+  return *line_;
+}
+
 void EntryScreen::registerBranches(const std::vector<std::string_view>& order) {
   Handlers handlers;
   provide(handlers);
@@ -125,8 +130,6 @@ void EntryScreen::provide(Handlers& handlers) {
   handlers.add("V_SAISIE_COMPT", this, &EntryScreen::v_saisie_compt);
   handlers.add("SAISIE_MTT", this, &EntryScreen::saisie_mtt);
   handlers.add("LST_MIRVAL.NUMCP", this, &EntryScreen::lst_mirval_numcp);
-  handlers.add("LST_VLIBCP2", this, &EntryScreen::lst_vlibcp2);
-  handlers.add("COMPT2_CHOISIR", this, &EntryScreen::compt2_choisir);
   handlers.add("LST_V_HT", this, &EntryScreen::lst_v_ht);
   handlers.add("LST_MIRVAL.COTVA", this, &EntryScreen::lst_mirval_cotva);
   handlers.add("CDTVA_CHOISIR", this, &EntryScreen::cdtva_choisir);
@@ -326,12 +329,6 @@ void EntryScreen::debut(Evt* e) {
     JONAL.raz();
     messageOk(kind_.noJournal);
   }
-
-  COMPT2.initRequete();
-  COMPT2.ajouteFiltre(COMPT2_NATUC, '?', lineNature());
-  COMPT2.ajouteFiltre(COMPT2_CCTRA, '#', "O");
-  COMPT2.choisitIndex("NUMCP");
-  COMPT2.activeRequete();
 
   CDTVA.initRequete();
   if (kind_.vatCodeFilter) CDTVA.ajouteFiltre(CDTVA_TYTVA, kind_.vatCodeFilter, kind_.vatCodeType);

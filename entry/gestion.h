@@ -42,6 +42,7 @@ namespace entry {
 using namespace host;
 
 class EntryScreen;
+class LineAccount;
 
 // The branch table of the client invoice screen, in registration order.
 extern const std::vector<std::string_view> kInvoiceBranches;
@@ -96,7 +97,7 @@ class Part {
   virtual bool takesModelAccount(const std::string& /*account*/) { return false; }
   // The account of the line typed or chosen, before it is checked: false once `e` is refused.
   virtual bool lineAccountAccepted(Evt* /*e*/, const std::string& /*account*/) { return true; }
-  // The account of the line was read into COMPT2 and the line completed from it.
+  // The account of the line was read and the line completed from it.
   virtual void lineAccountRead() {}
   // The checks of the lines as a whole ("CONTROLER_LST"): false once `e` is refused.
   virtual bool linesAccepted(Evt* /*e*/) { return true; }
@@ -202,8 +203,10 @@ class EntryScreen : public model::Gestion_document2 {
   void v_saisie_compt(Evt* e);
   void saisie_mtt(Evt* e);
   void lst_mirval_numcp(Evt* e);
-  void lst_vlibcp2(Evt* e);
-  void compt2_choisir(Evt* e);
+  // The label of the line account typed ("LST_VLIBCP2"), its choice window
+  // ("COMPT2_CHOISIR"): the line account part names them.
+  void lineAccountLabel(Evt* e);
+  void chooseLineAccount(Evt* e);
   void lst_v_ht(Evt* e);
   void lst_mirval_cotva(Evt* e);
   void cdtva_choisir(Evt* e);
@@ -276,7 +279,7 @@ class EntryScreen : public model::Gestion_document2 {
   void afficherLigne() { ecran()->fonction(20, "LST"); }
   // Reserves and confirms a new identifier of the counter `table` into `ident`.
   void nouvelIdentifiant(const char* table, Donnee& ident);
-  // Completes a line whose account was just read into COMPT2 (VAT code and rate,
+  // Completes a line whose account the line account part has just read (VAT code and rate,
   // amounts, analytic codes).
   void completerLigne();
   // Reads into `t` the account `account` among those of nature `nature` ("" any) that
@@ -295,7 +298,9 @@ class EntryScreen : public model::Gestion_document2 {
   void copyAnalyticRows(const std::string& source, const std::function<Decimal(const Donnee&)>& atNewRate);
 
   const registry::OperationKind& kind_;
-  std::vector<Part*> parts_;  // in the order they were made
+  std::vector<Part*> parts_;     // in the order they were made
+  LineAccount* line_ = nullptr;  // the part that holds the line's account
+  LineAccount& line();
 
   // ---- launch parameters
   Chaine PIDENT{"PIDENT", "", "", 0, this};
@@ -305,8 +310,6 @@ class EntryScreen : public model::Gestion_document2 {
   Chaine V_SAISIE_COMPT{"V_SAISIE_COMPT", "", "", 0, this};
   Chaine V_SAISIE_COMPT2{"V_SAISIE_COMPT2", "", "", 0, this};
   Chaine V_SAISIE_MTT{"V_SAISIE_MTT", "", "", 0, this};
-  Chaine VNUMCP2{"VNUMCP2", "", "", 0, this};
-  Chaine VLIBCP2{"VLIBCP2", "", "", 0, this};
   Monnaie V_HT{"V_HT", "", "", 0, this};
   Monnaie V_TTC{"V_TTC", "", "", 0, this};
   Date DATE_CLOTURE{"DATE_CLOTURE", "Date de clôture", "8", 0, this};
@@ -337,7 +340,6 @@ class EntryScreen : public model::Gestion_document2 {
   // ---- tables (the main table MIRVAE is the automaton's own)
   Table MIRVAL{this, "", "MIRVAL", ""};
   Table MEM_MIRVAL{this, "", "MEM:MIRVAL", "MEM_MIRVAL"};
-  Table COMPT2{this, "", "COMPT", "COMPT2"};
   Table MIRVAL2{this, "", "MIRVAL", "MIRVAL2"};
   Table MIRVAANA2{this, "", "MIRVAANA", "MIRVAANA2"};
   Table PARAM{this, "", "PARAM", ""};
@@ -402,13 +404,6 @@ class EntryScreen : public model::Gestion_document2 {
   Champ MIRVAANA_M01_NUMERO{"NUMERO", &MIRVAANA_M01};
   Champ MIRVAANA_M01_MTADE{"MTADE", &MIRVAANA_M01};
   Champ MIRVAANA_M01_MTACR{"MTACR", &MIRVAANA_M01};
-  Champ COMPT2_NUMCP{"NUMCP", &COMPT2};
-  Champ COMPT2_LIBCP{"LIBCP", &COMPT2};
-  Champ COMPT2_NATUC{"NATUC", &COMPT2};
-  Champ COMPT2_CCTRA{"CCTRA", &COMPT2};
-  Champ COMPT2_COTVA{"COTVA", &COMPT2};
-  Champ COMPT2_CPOST{"CPOST", &COMPT2};
-  Champ COMPT2_CCRIT{"CCRIT", &COMPT2};
   Champ COMPT_NUMCP{"NUMCP", &COMPT};
   Champ COMPT_LIBCP{"LIBCP", &COMPT};
   Champ COMPT_NATUC{"NATUC", &COMPT};

@@ -14,6 +14,7 @@ class MIRVAEGestion1 : public entry::EntryScreen {
  private:
   entry::EntryModels models_{*this};
   entry::HeaderAccount header_{*this};
+  entry::AccountOfNature lineAccount_{*this};
   entry::VatTotals totals_{*this};
   entry::PrintAfterSaving print_{*this};
 };

@@ -18,6 +18,7 @@ class MIRVAEGestion2 : public entry::EntryScreen {
  private:
   entry::EntryModels models_{*this};
   entry::HeaderAccount header_{*this};
+  entry::AccountOfNature lineAccount_{*this};
   entry::VatTotals totals_{*this};
   entry::PrintAfterSaving print_{*this};
 };

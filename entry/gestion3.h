@@ -62,6 +62,7 @@ class MIRVAEGestion3 : public entry::EntryScreen {
   void provide(entry::Handlers& handlers) override;
 
   entry::StaffOrSupplier header_{*this};
+  entry::AccountOfNature lineAccount_{*this};
   entry::VatTotals totals_{*this};
   entry::PrintAfterSaving print_{*this};
   host::Table TYPFR{this, "", "TYPFR", ""};

@@ -4,7 +4,7 @@
 // The user types one amount in the column "LST_V_HT": excluding tax when SAISIE_MTT
 // is "1", including tax when it is "2". Only the VAT is rounded; the other amount is
 // the typed one plus or minus that VAT, so HT + TVA = TTC holds on every line.
-#include "entry/gestion.h"
+#include "entry/parts.h"
 
 #include <array>
 
@@ -22,8 +22,9 @@ bool contient(const Donnee& letters, char letter) { return letters.chaine().find
 
 void EntryScreen::selection(Evt* e) {
   Sdocum::selection(e);
-  lireOuVider(COMPT2, COMPT2_NUMCP, MIRVAL_NUMCP);
-  VLIBCP2 = COMPT2_LIBCP;
+  LineAccount& account = line();
+  lireOuVider(account.accounts(), account.NUMCP(), MIRVAL_NUMCP);
+  account.label() = account.LIBCP();
   lireOuVider(CDTVA, CDTVA_COTVA, MIRVAL_COTVA);
   if (MIRVAE_SAISIE_MTT == "1") {
     V_HT = MIRVAL_HT;
@@ -36,15 +37,18 @@ void EntryScreen::selection(Evt* e) {
 
 void EntryScreen::ctrl_debut_ligne(Evt* e) {
   Sdocum::ctrl_debut_ligne(e);
+  LineAccount& account = line();
   if (lireOuVider(COMPT, COMPT_NUMCP, MIRVAL_NUMCP)) {
-    VLIBCP2 = COMPT_LIBCP;
-    VNUMCP2 = COMPT_NUMCP;
+    account.label() = COMPT_LIBCP;
+    account.number() = COMPT_NUMCP;
   } else {
-    VLIBCP2 = "";
-    VNUMCP2 = "";
+    account.label() = "";
+    account.number() = "";
   }
-  COMPT2.raz();
-  COMPT2.copier(COMPT);
+  if (&account.accounts() != &COMPT) {
+    account.accounts().raz();
+    account.accounts().copier(COMPT);
+  }
   enFile("V_SAISIE_COMPT");
   ANA_O_N = 0;
   if (ANA_GR_ACTIF == 1) {
@@ -70,9 +74,9 @@ void EntryScreen::v_saisie_compt2_ferme(Evt*) { enFile("V_SAISIE_COMPT"); }
 void EntryScreen::v_saisie_compt(Evt*) {
   if (V_SAISIE_COMPT == "NUMCP") {
     ecran()->autorise("LST_MIRVAL.NUMCP", "");
-    ecran()->interdit("LST_VLIBCP2", "");
+    ecran()->interdit(line().labelControl(), "");
   } else if (V_SAISIE_COMPT == "LIBCP") {
-    ecran()->autorise("LST_VLIBCP2", "");
+    ecran()->autorise(line().labelControl(), "");
     ecran()->interdit("LST_MIRVAL.NUMCP", "");
   }
 }
@@ -105,9 +109,10 @@ void EntryScreen::saisie_mtt(Evt*) {
 // ---------------------------------------------------------------------------- account of the line
 
 void EntryScreen::lst_mirval_numcp(Evt* e) {
+  LineAccount& account = line();
   if (MIRVAL_NUMCP.estVide()) {
-    VNUMCP2 = "";
-    VLIBCP2 = "";
+    account.number() = "";
+    account.label() = "";
     afficherLigne();
     return;
   }
@@ -115,7 +120,7 @@ void EntryScreen::lst_mirval_numcp(Evt* e) {
     if (!part->lineAccountAccepted(e, MIRVAL_NUMCP.chaine())) return;
   EvtParamVal controle(3, "NUMCP", &MIRVAL_NUMCP, lineNature());
   procedure("CONTROLER_COMPT", &controle);
-  if (erreurMethode() != 0 || COMPT2.lit(3, COMPT2_NUMCP, '=', MIRVAL_NUMCP) != 0) {
+  if (erreurMethode() != 0 || account.accounts().lit(3, account.NUMCP(), '=', MIRVAL_NUMCP) != 0) {
     controler("LST_MIRVAL.NUMCP");
     rejeter(e);
     return;
@@ -123,19 +128,20 @@ void EntryScreen::lst_mirval_numcp(Evt* e) {
   completerLigne();
 }
 
-void EntryScreen::lst_vlibcp2(Evt* e) {
-  if (VLIBCP2.estVide()) {
-    VNUMCP2 = "";
+void EntryScreen::lineAccountLabel(Evt* e) {
+  LineAccount& account = line();
+  if (account.label().estVide()) {
+    account.number() = "";
     MIRVAL_NUMCP = "";
     afficherLigne();
     return;
   }
   for (Part* part : parts_)
-    if (!part->lineAccountAccepted(e, VLIBCP2.chaine())) return;
-  EvtParamVal controle(3, "LIBCP", &VLIBCP2, lineNature());
+    if (!part->lineAccountAccepted(e, account.label().chaine())) return;
+  EvtParamVal controle(3, "LIBCP", &account.label(), lineNature());
   procedure("CONTROLER_COMPT", &controle);
-  if (erreurMethode() != 0 || COMPT2.lit(3, COMPT2_LIBCP, '=', VLIBCP2) != 0) {
-    controler("LST_VLIBCP2");
+  if (erreurMethode() != 0 || account.accounts().lit(3, account.LIBCP(), '=', account.label()) != 0) {
+    controler(account.labelControl());
     rejeter(e);
     return;
   }
@@ -143,14 +149,15 @@ void EntryScreen::lst_vlibcp2(Evt* e) {
 }
 
 void EntryScreen::completerLigne() {
-  VLIBCP2 = COMPT2_LIBCP;
-  VNUMCP2 = COMPT2_NUMCP;
-  MIRVAL_NUMCP = COMPT2_NUMCP;
+  LineAccount& account = line();
+  account.label() = account.LIBCP();
+  account.number() = account.NUMCP();
+  MIRVAL_NUMCP = account.NUMCP();
   if (TVA_GR_ACTIF == 0) {
     MIRVAL_COTVA = "";
     MIRVAL_TXTVA = 0;
   } else {
-    MIRVAL_COTVA = COMPT2_COTVA;
+    MIRVAL_COTVA = account.COTVA();
     lireOuVider(CDTVA, CDTVA_COTVA, MIRVAL_COTVA);
     EvtParamRef taux(3, &CDTVA_COTVA, &MIRVAE_DTOPE, &VTXTVA);
     compta("LECTURE_HISTO_TXTVA", &taux);
@@ -158,46 +165,47 @@ void EntryScreen::completerLigne() {
     MIRVAL_TXTVA = VTXTVA.decimal();
   }
   procedure("CALCUL_MTT_LIGNE");
-  MIRVAL_CPOST = COMPT2_CPOST;
-  MIRVAL_CCRIT = COMPT2_CCRIT;
+  MIRVAL_CPOST = account.CPOST();
+  MIRVAL_CCRIT = account.CCRIT();
   for (Part* part : parts_) part->lineAccountRead();
   afficherLigne();
 }
 
-void EntryScreen::compt2_choisir(Evt*) {
+void EntryScreen::chooseLineAccount(Evt*) {
   if (enVisualisation()) {
     messageOk("Opération interdite en mode visualisation !");
     return;
   }
   EvtParamVal liste(1, "LST");
   procedure("CTRL_DEBUT_MODIF_LISTE", &liste);
+  LineAccount& account = line();
   bool parNumero = V_SAISIE_COMPT == "NUMCP";
-  Chaine& valeur = parNumero ? VNUMCP2 : VLIBCP2;
+  Chaine& valeur = parNumero ? account.number() : account.label();
   const char* colonne = parNumero ? "NUMCP" : "LIBCP";
   // The window opens on the kind's pattern of accounts, if it has one.
   Chaine pattern(kind_.lineAccountPattern);
   Donnee* start = *kind_.lineAccountPattern ? static_cast<Donnee*>(&pattern)
-                                            : parNumero ? &COMPT2_NUMCP : &COMPT2_LIBCP;
+                                            : parNumero ? &account.NUMCP() : &account.LIBCP();
   EvtParamRef choix(5, &valeur, start, lineNature(), colonne, "N");
   appelerProcedure("*", "CPCOMPT", "INTERFACE", "CHOIX_INTITULE_REDUIT", &choix, -1);
   EvtParamVal controle(3, colonne, &valeur, lineNature());
   procedure("CONTROLER_COMPT", &controle);
   if (erreurMethode() != 0 || valeur.estVide()) {
-    VNUMCP2 = "";
-    VLIBCP2 = "";
+    account.number() = "";
+    account.label() = "";
     MIRVAL_NUMCP = "";
     afficherLigne();
     return;
   }
-  VLIBCP2 = COMPT_LIBCP;
-  VNUMCP2 = COMPT_NUMCP;
-  enFile("LST_VLIBCP2");
+  account.label() = COMPT_LIBCP;
+  account.number() = COMPT_NUMCP;
+  enFile(account.labelControl());
 }
 
 void EntryScreen::ctrl_ouvre(Evt* e) {
   std::string control = e->nbParams() > 0 ? e->parametre(0).chaine() : std::string();
-  if (control == "LST_MIRVAL.NUMCP" || control == "LST_VLIBCP2")
-    procedure("COMPT2_CHOISIR");
+  if (control == "LST_MIRVAL.NUMCP" || control == line().labelControl())
+    procedure(line().chooseBranch());
   else if (control == "LST_MIRVAL.COTVA")
     procedure("CDTVA_CHOISIR");
   else
@@ -308,7 +316,7 @@ void EntryScreen::calcul_ht(Evt*) {
 // ---------------------------------------------------------------------------- line validation and totals
 
 void EntryScreen::validation_ligne(Evt* e) {
-  if (MIRVAL_NUMCP.estVide()) return refuser(e, kind_.lineAccountRequired, "LST_VLIBCP2");
+  if (MIRVAL_NUMCP.estVide()) return refuser(e, kind_.lineAccountRequired, line().labelControl());
   if (V_HT == 0)
     return refuser(e, "La saisie d'un montant " + V_SAISIE_MTT.chaine() + " est obligatoire !", "LST_V_HT");
   if (!(MIRVAL_TVA == 0) && MIRVAL_COTVA.estVide())

@@ -116,7 +116,8 @@ void EntryModels::modte_generer(Evt*) {
     bool found = compt.suivant(3) == 0;
     compt.initRequete();
     if (!found) continue;
-    if (!EntryScreen::readAccountOfNature(s_.COMPT2, s_.COMPT2_NUMCP, s_.COMPT2_NATUC, s_.COMPT2_CCTRA,
+    LineAccount& line = s_.line();
+    if (!EntryScreen::readAccountOfNature(line.accounts(), line.NUMCP(), line.NATUC(), line.CCTRA(),
                                           s_.COMPT_NUMCP.chaine(), s_.lineNature().c_str()))
       continue;
     addModelLine();
@@ -130,27 +131,28 @@ void EntryModels::modte_generer(Evt*) {
   s_.ecran()->fonction(16, "LST");
 }
 
-// A line of the model on the account in COMPT2. Amounts stay empty: the user types them.
+// A line of the model on the account the line account part has just read. Amounts stay empty: the user types them.
 void EntryModels::addModelLine() {
   EntryScreen& s = s_;
   s.MIRVAL.raz();
   s.nouvelIdentifiant("MIRVAL", s.MIRVAL_IDENT);
   s.MIRVAL_NUMERO = s.MIRVAE_IDENT.chaine() + "|";
-  s.MIRVAL_NUMCP = s.COMPT2_NUMCP;
+  LineAccount& line = s.line();
+  s.MIRVAL_NUMCP = line.NUMCP();
   s.MIRVAL_LIBEC = MODLI_COL_LIBEC.estVide() ? s.MIRVAE_INPIE.chaine() : MODLI_COL_LIBEC.chaine();
   // As for a typed line: no VAT code or rate when the dossier does not manage VAT.
   if (s.TVA_GR_ACTIF == 0) {
     s.MIRVAL_COTVA = "";
     s.MIRVAL_TXTVA = 0;
   } else {
-    s.MIRVAL_COTVA = MODLI_COL_COTVA.estVide() ? s.COMPT2_COTVA.chaine() : MODLI_COL_COTVA.chaine();
+    s.MIRVAL_COTVA = MODLI_COL_COTVA.estVide() ? line.COTVA().chaine() : MODLI_COL_COTVA.chaine();
     EntryScreen::lireOuVider(s.CDTVA, s.CDTVA_COTVA, s.MIRVAL_COTVA);
     EvtParamRef taux(3, &s.CDTVA_COTVA, &s.MIRVAE_DTOPE, &s.VTXTVA);
     s.compta("LECTURE_HISTO_TXTVA", &taux);
     s.MIRVAL_TXTVA = s.VTXTVA.decimal();
   }
-  s.MIRVAL_CPOST = s.COMPT2_CPOST;
-  s.MIRVAL_CCRIT = s.COMPT2_CCRIT;
+  s.MIRVAL_CPOST = line.CPOST();
+  s.MIRVAL_CCRIT = line.CCRIT();
   s.procedure("AJOUTER_LIGNE");
 }
 

@@ -7,6 +7,66 @@
 
 namespace entry {
 
+// The account of a line: typed by number into MIRVAL.NUMCP or by its label, chosen in
+// a window, and read through a binding of the chart of accounts. Every kind has one;
+// kinds name it differently and offer different accounts. The subclass makes the
+// members and binds them.
+class LineAccount : public Part {
+ public:
+  struct Members {
+    Chaine* number;
+    Chaine* label;
+    Table* accounts;
+    Champ *NUMCP, *LIBCP, *NATUC, *CCTRA, *COTVA, *CPOST, *CCRIT;
+  };
+  // `labelControl` is the list column of the label, `chooseBranch` the branch of the
+  // choice window.
+  LineAccount(EntryScreen& screen, const char* labelControl, const char* chooseBranch);
+
+  void provide(Handlers& handlers) override;
+  // The accounts the lines may take, by number.
+  void started() override;
+
+  const char* labelControl() const { return label_control_; }
+  const char* chooseBranch() const { return choose_branch_; }
+  Chaine& number() { return *m_.number; }
+  Chaine& label() { return *m_.label; }
+  Table& accounts() { return *m_.accounts; }
+  Champ& NUMCP() { return *m_.NUMCP; }
+  Champ& LIBCP() { return *m_.LIBCP; }
+  Champ& NATUC() { return *m_.NATUC; }
+  Champ& CCTRA() { return *m_.CCTRA; }
+  Champ& COTVA() { return *m_.COTVA; }
+  Champ& CPOST() { return *m_.CPOST; }
+  Champ& CCRIT() { return *m_.CCRIT; }
+
+ protected:
+  void bind(const Members& members) { m_ = members; }
+
+ private:
+  const char* label_control_;
+  const char* choose_branch_;
+  Members m_{};
+};
+
+// The line account of invoices, expense notes, bank and cash operations: VNUMCP2,
+// VLIBCP2, among the accounts of the kind's line nature (COMPT2).
+class AccountOfNature : public LineAccount {
+ public:
+  explicit AccountOfNature(EntryScreen& screen);
+
+  Chaine VNUMCP2{"VNUMCP2", "", "", 0, &s_};
+  Chaine VLIBCP2{"VLIBCP2", "", "", 0, &s_};
+  Table COMPT2{&s_, "", "COMPT", "COMPT2"};
+  Champ COMPT2_NUMCP{"NUMCP", &COMPT2};
+  Champ COMPT2_LIBCP{"LIBCP", &COMPT2};
+  Champ COMPT2_NATUC{"NATUC", &COMPT2};
+  Champ COMPT2_CCTRA{"CCTRA", &COMPT2};
+  Champ COMPT2_COTVA{"COTVA", &COMPT2};
+  Champ COMPT2_CPOST{"CPOST", &COMPT2};
+  Champ COMPT2_CCRIT{"CCRIT", &COMPT2};
+};
+
 // The header account of invoices and expense notes: the counterparty typed by its
 // label (VLIBCP1) into MIRVAE.NUMCP, chosen among the accounts of the kind's nature.
 class HeaderAccount : public Part {
