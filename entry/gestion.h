@@ -210,7 +210,7 @@ class EntryScreen : public model::Gestion_document2 {
   void lst_v_ht(Evt* e);
   void lst_mirval_cotva(Evt* e);
   void cdtva_choisir(Evt* e);
-  void lst_mirval_tva(Evt* e);
+  virtual void lst_mirval_tva(Evt* e);
   void calcul_mtt_ligne(Evt* e);
   void calcul_tva_selon_ht(Evt* e);
   void calcul_tva_selon_ttc(Evt* e);

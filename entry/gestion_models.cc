@@ -37,7 +37,8 @@ bool EntryScreen::readAccountOfNature(Table& t, Champ& numcp, Champ& natuc, Cham
 
 // ---------------------------------------------------------------------------- entry models
 
-EntryModels::EntryModels(EntryScreen& screen) : Part(screen) {}
+EntryModels::EntryModels(EntryScreen& screen, bool offeredOnCreation)
+    : Part(screen), offered_on_creation_(offeredOnCreation) {}
 
 void EntryModels::provide(Handlers& handlers) {
   handlers.add("V_CMODEL", this, &EntryModels::v_cmodel);
@@ -46,7 +47,9 @@ void EntryModels::provide(Handlers& handlers) {
   handlers.add("MODTE_GENERER", this, &EntryModels::modte_generer);
 }
 
-void EntryModels::creationStarted() { s_.ecran()->autorise("V_CMODEL", "MODTE_CHOISIR", ""); }
+void EntryModels::creationStarted() {
+  if (offered_on_creation_) s_.ecran()->autorise("V_CMODEL", "MODTE_CHOISIR", "");
+}
 
 void EntryModels::creationShown() {
   if (!V_CMODEL.estVide()) s_.procedure("MODTE_GENERER");

@@ -103,7 +103,8 @@ class EntryModels : public Part {
   // The branches of the part, in the order they are registered.
   static constexpr std::string_view kBranches[] = {"V_CMODEL", "V_CMODEL_CHOISIR", "MODTE_CHOISIR", "MODTE_GENERER"};
 
-  explicit EntryModels(EntryScreen& screen);
+  // `offeredOnCreation`: whether a new operation opens with the model controls allowed.
+  explicit EntryModels(EntryScreen& screen, bool offeredOnCreation = true);
 
   void provide(Handlers& handlers) override;
   void creationStarted() override;
@@ -129,8 +130,10 @@ class EntryModels : public Part {
   Champ MODLI_COL_COTVA{"COL_COTVA", &MODLI};
 
  private:
-  // Adds a line of the current model line on the account read into COMPT2.
+  // Adds a line of the current model line on the account the line account part read.
   void addModelLine();
+
+  bool offered_on_creation_;
 };
 
 // The form printed after saving, when the user chose "3Enregistrer et ~Imprimer".

@@ -4,6 +4,7 @@
 #include "entry/gestion1.h"
 #include "entry/gestion2.h"
 #include "entry/gestion3.h"
+#include "entry/gestion6.h"
 #include "host/registry.h"
 #include "host/value.h"
 #include "posting/creer_piece_bq.h"
@@ -89,6 +90,7 @@ void declarerUnites() {
   // Unit CREER_PIECE_OD, GESTION6.
   static const Global creerPieceOdGlobal("MIRVAE", "MIRVAE");
   static const Module creerPieceOd("", "MIRVAE-CREER_PIECE_OD", &host::fabriquer<MIRVAECreer_piece_od>, false, "");
+  static const Module gestion6("", "MIRVAE-GESTION6", &host::fabriquer<MIRVAEGestion6>, false, "");
   static const Source creerPieceOdSource("MIRVAE", nullptr);
 
   // Unit INTERFACE: it also works with the globals of the general-ledger library.

@@ -509,7 +509,7 @@ TEST_F(RegistreTest, UnitsDeclareInLoadOrder) {
       "Global MIRVAE", "Module MIRVAE-CREER_PIECE_NDF", "Module MIRVAE-GESTION3", "Source MIRVAE",
       "Global MIRVAE", "Module MIRVAE-CREER_PIECE_BQ", "Source MIRVAE",
       "Global MIRVAE", "Module MIRVAE-CREER_PIECE_CA", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_OD", "Source MIRVAE",
+      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_OD", "Module MIRVAE-GESTION6", "Source MIRVAE",
       "Global COMPTA", "Global MIRVAE", "Module MIRVAE-INTERFACE", "Source MIRVAE"};
   // Modules the tests stand in for, when the library has not built them yet, come
   // after the library's own declarations.

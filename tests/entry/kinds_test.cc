@@ -44,6 +44,9 @@ TEST_F(KindsTest, EachKindRegistersEveryBranchOnceInItsOrder) {
       {1, {}, {}},
       {2, {}, {}},
       {3, models, {"VTIERS1", "VTIERS1_FERME", "FAIT_INPIE", "TYPFR_CHOISIR", "LST_MIRVAL.LIBEC", "LIRE_LIGNE_PRECEDENTE"}},
+      {6,
+       {"VLIBCP1", "COMPT1_CHOISIR", "LST_VLIBCP2", "COMPT2_CHOISIR"},
+       {"COMPT_CHOISIR", "LST_VLIBCP", "LST_VLIBSENS_DC", "CALCUL_DC", "TYPLB_CHOISIR", "TESTS_VALIDATION"}},
   };
   for (const auto& c : cases) {
     SCOPED_TRACE(c.kind);
@@ -55,7 +58,8 @@ TEST_F(KindsTest, EachKindRegistersEveryBranchOnceInItsOrder) {
     ASSERT_TRUE(creer());
     EXPECT_EQ(ecran().branches(), expected);
     // A part the kind lacks leaves none of its declarations behind.
-    EXPECT_EQ(ecran().variable("V_CMODEL") != nullptr, c.left.empty());
+    EXPECT_EQ(ecran().variable("V_CMODEL") != nullptr, c.kind != 3);
+    EXPECT_EQ(ecran().variable("VLIBCP2") != nullptr, c.kind != 6);
     model::fermer(session());
   }
 }
@@ -63,11 +67,12 @@ TEST_F(KindsTest, EachKindRegistersEveryBranchOnceInItsOrder) {
 TEST_F(KindsTest, ANewOperationTakesItsKindsDefaults) {
   const struct {
     int kind;
-    const char *type, *journal, *label;
+    const char *type, *journal, *label, *dueDate, *amountTyped;
   } cases[] = {
-      {1, "FC", "VT", "Facture client n° "},
-      {2, "FF", "AC", "Facture fournisseur n° "},
-      {3, "NDF", "AC", "Note de frais personnel n° "},
+      {1, "FC", "VT", "Facture client n° ", "15/03/2024", "1"},
+      {2, "FF", "AC", "Facture fournisseur n° ", "15/03/2024", "1"},
+      {3, "NDF", "AC", "Note de frais personnel n° ", "15/03/2024", "1"},
+      {6, "OD", "OD", "Opération diverse", "", "2"},
   };
   for (const auto& c : cases) {
     SCOPED_TRACE(c.kind);
@@ -75,8 +80,8 @@ TEST_F(KindsTest, ANewOperationTakesItsKindsDefaults) {
     ASSERT_TRUE(creer());
     EXPECT_EQ(valeur("MIRVAE.TYPE"), c.type);
     EXPECT_EQ(valeur("MIRVAE.NUMJL"), c.journal);
-    EXPECT_EQ(valeur("MIRVAE.DTECH"), "15/03/2024");
-    EXPECT_EQ(valeur("MIRVAE.SAISIE_MTT"), "1");
+    EXPECT_EQ(valeur("MIRVAE.DTECH"), c.dueDate);
+    EXPECT_EQ(valeur("MIRVAE.SAISIE_MTT"), c.amountTyped);
     EXPECT_TRUE(valeur("MIRVAE.INPIE").starts_with(c.label)) << valeur("MIRVAE.INPIE");
     model::fermer(session());
   }
@@ -163,6 +168,82 @@ TEST_F(KindsTest, AnExpenseNoteAndASupplierInvoiceOfTheSameLinesPostTheSameMovem
   }
   EXPECT_EQ(posted[0], posted[1]);
   EXPECT_EQ(posted[0], "445660 0 4, 445660 20 0, 601000 100 0, 625100 0 40");
+  EXPECT_TRUE(testing_support::incoherences(base()).empty());
+}
+
+// A miscellaneous line: account, side, then amount (including tax) or, on a VAT
+// account, its VAT.
+class MiscellaneousTest : public Gestion1Test {
+ protected:
+  void SetUp() override {
+    Gestion1Test::SetUp();
+    kind_ = 6;
+  }
+  bool ligneOd(const std::string& account, const std::string& sense, const std::string& amount, bool validate = true) {
+    if (!model::nouvelleLigne(session()) || !saisir("LST_MIRVAL.NUMCP", account)) return false;
+    if (!saisir("LST_VLIBSENS_DC", sense)) return false;
+    bool vat = sql("SELECT instr(NATUC, 'T') > 0 FROM COMPT WHERE NUMCP = '" + account + "'") == "1";
+    if (!saisir(vat ? "LST_MIRVAL.TVA" : "LST_V_HT", amount)) return false;
+    return !validate || model::validerLigne(session());
+  }
+};
+
+TEST_F(MiscellaneousTest, LineChecksFireInTheirOrder) {
+  ASSERT_TRUE(creer());
+  const struct {
+    const char *account, *sense, *amount, *message;
+  } cases[] = {
+      {"", "D", "", "La saisie d'un compte général est obligatoire !"},
+      {"445660", "D", "", "La saisie d'un montant TVA est obligatoire !"},
+      {"627000", "D", "", "La saisie d'un montant TTC est obligatoire !"},
+      {"627000", "", "12", "La saisie d'un sens D/C est obligatoire !"},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.message);
+    ASSERT_TRUE(model::nouvelleLigne(session()));
+    if (*c.account) {
+      ASSERT_TRUE(saisir("LST_MIRVAL.NUMCP", c.account));
+    }
+    if (*c.sense) {
+      ASSERT_TRUE(saisir("LST_VLIBSENS_DC", c.sense));
+    }
+    if (*c.amount) {
+      ASSERT_TRUE(saisir("LST_V_HT", c.amount));
+    }
+    EXPECT_FALSE(model::validerLigne(session()));
+    EXPECT_EQ(dernierMessage(), c.message);
+    ASSERT_TRUE(model::abandonnerLigne(session()));
+  }
+}
+
+TEST_F(MiscellaneousTest, AVatAccountTakesItsAmountAsVatAndAnUnbalancedPieceIsRefused) {
+  ASSERT_TRUE(creer());
+  // A VAT settlement: the VAT owed paid from the bank, the deductible VAT set off.
+  ASSERT_TRUE(ligneOd("445711", "D", "500"));
+  EXPECT_EQ(valeur("LST_MIRVAL.HT"), "0.00");
+  EXPECT_EQ(valeur("LST_MIRVAL.TTC"), "500.00");
+  EXPECT_TRUE(ecran().ecran()->estInterdit("LST_V_HT"));
+  ASSERT_TRUE(ligneOd("445660", "C", "180"));
+  ASSERT_TRUE(ligneOd("512100", "C", "300"));
+  EXPECT_EQ(valeur("V_TOT_DEB"), "500.00");
+  EXPECT_EQ(valeur("V_TOT_CRE"), "480.00");
+  EXPECT_EQ(valeur("V_SOLDE"), "20.00");
+  enregistrer();
+  EXPECT_EQ(dernierMessage(),
+            "L'opération n'est pas équilibrée : débit 500.00, crédit 480.00, écart 20.00.@La validation est impossible !");
+  EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE"), 0);
+
+  ASSERT_TRUE(model::allerLigne(session(), 3));
+  ASSERT_TRUE(saisir("LST_V_HT", "320"));
+  ASSERT_TRUE(model::validerLigne(session()));
+  EXPECT_EQ(valeur("V_SOLDE"), "0.00");
+  ASSERT_TRUE(enregistrer());
+  EXPECT_EQ(sql("SELECT HT || ' ' || TVA || ' ' || TTC || ' ' || DEBPIS || ' ' || CREPIS FROM MIRVAE"),
+            "320 680 1000 500 500");
+  std::string piece = sql("SELECT NPIES FROM MIRVAE");
+  EXPECT_EQ(sql("SELECT group_concat(NUMCP || ' ' || MTDEBS || ' ' || MTCRES, ', ') FROM (SELECT * FROM MOUVE "
+                "WHERE NPIES = '" + piece + "' ORDER BY NUMCP)"),
+            "445660 0 180, 445711 500 0, 512100 0 320");
   EXPECT_TRUE(testing_support::incoherences(base()).empty());
 }
 
