@@ -130,6 +130,8 @@ class EntryScreen : public model::Gestion_document2 {
   virtual bool lineOnDebit() = 0;
   // The label of a new operation whose journal gives no label prefix.
   virtual std::string defaultLabel() { return kind_.defaultLabel; }
+  // Completes a line made from the entry model line in `model` before it is added.
+  virtual void completeModelLine(Table& /*model*/) {}
   // The nature letters of a line account ("" any).
   virtual std::string lineNature() { return kind_.lineNature; }
   // The VAT type given to the VAT code choice window.

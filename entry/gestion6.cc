@@ -142,6 +142,13 @@ void MIRVAEGestion6::provide(entry::Handlers& handlers) {
   handlers.add("CALCUL_DC", this, &MIRVAEGestion6::calcul_dc);
 }
 
+void MIRVAEGestion6::completeModelLine(host::Table& model) {
+  if (!model.valeur("COL_MTDEB").decimal().isZero())
+    MIRVAL_SENS_DC = "D";
+  else if (!model.valeur("COL_MTCRE").decimal().isZero())
+    MIRVAL_SENS_DC = "C";
+}
+
 void MIRVAEGestion6::selection(Evt* e) {
   EntryScreen::selection(e);
   lineAccount_.VLIBSENS_DC = entry::senseLabel(MIRVAL_SENS_DC);

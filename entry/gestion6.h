@@ -66,6 +66,9 @@ class MIRVAEGestion6 : public entry::EntryScreen {
   bool lineOnDebit() override { return MIRVAL_SENS_DC == "D"; }
   // A debit of VAT is deductible, a credit is collected.
   std::string vatChoiceType() override { return MIRVAL_SENS_DC == "D" ? "A" : "V"; }
+  // A model line gives its side, by which of its amounts it carries; the amount
+  // itself is typed, as on every kind's model lines.
+  void completeModelLine(host::Table& model) override;
   void selection(host::Evt* e) override;
   void debut_creation_ligne(host::Evt* e) override;
   void lst_mirval_tva(host::Evt* e) override;

@@ -156,6 +156,7 @@ void EntryModels::addModelLine() {
   }
   s.MIRVAL_CPOST = line.CPOST();
   s.MIRVAL_CCRIT = line.CCRIT();
+  s.completeModelLine(MODLI);
   s.procedure("AJOUTER_LIGNE");
 }
 

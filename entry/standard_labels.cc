@@ -10,7 +10,7 @@ void StandardLabels::provide(Handlers& handlers) {
 }
 
 bool StandardLabels::chooses(const std::string& control) {
-  if (control != "INPIE") return false;
+  if (control != "MIRVAE.INPIE") return false;
   s_.procedure("TYPLB_CHOISIR");
   return true;
 }

@@ -247,4 +247,35 @@ TEST_F(MiscellaneousTest, AVatAccountTakesItsAmountAsVatAndAnUnbalancedPieceIsRe
   EXPECT_TRUE(testing_support::incoherences(base()).empty());
 }
 
+TEST_F(MiscellaneousTest, AModelGivesItsLinesSidesAndTheLastChecksStopAClosedAccount) {
+  ASSERT_TRUE(creer());
+  ASSERT_TRUE(saisir("V_CMODEL", "ODCAISSE"));
+  ASSERT_EQ(model::nombreLignes(session()), 2u);
+  const struct {
+    const char *account, *sense, *amount;
+  } lines[] = {{"530000", "D", "150"}, {"512100", "C", "150"}};
+  for (int i = 0; i < 2; ++i) {
+    ASSERT_TRUE(model::allerLigne(session(), i + 1));
+    EXPECT_EQ(valeur("LST_MIRVAL.NUMCP"), lines[i].account);
+    EXPECT_EQ(valeur("LST_MIRVAL.SENS_DC"), lines[i].sense);
+    EXPECT_EQ(valeur("LST_V_HT"), "0.00");
+    ASSERT_TRUE(saisir("LST_V_HT", lines[i].amount));
+    ASSERT_TRUE(model::validerLigne(session()));
+  }
+  // The piece label from the standard labels.
+  user_.ajouterChoix("APPRO");
+  ASSERT_TRUE(model::ouvrirChoix(session(), "MIRVAE.INPIE"));
+  EXPECT_EQ(valeur("MIRVAE.INPIE"), "Approvisionnement de la caisse");
+  // An account closed to entries since it was typed: the user may read why.
+  sql("UPDATE COMPT SET CCTRA = 'O' WHERE NUMCP = '530000'");
+  user_.ajouterDialogue("1");  // save
+  user_.ajouterDialogue("2");  // see the memo
+  appuyer("B_VALID_DOC");
+  std::vector<std::string> told = messages();
+  ASSERT_GE(told.size(), 1u);
+  EXPECT_EQ(session().transcript().textes("dialogue").back().rfind("Information : Le compte suivant est interdit en saisie : 530000", 0), 0u);
+  EXPECT_EQ(told.back().rfind("Un compte interdit en saisie ne reçoit plus d'écriture.", 0), 0u);
+  EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE"), 0);
+}
+
 }  // namespace
