@@ -330,13 +330,18 @@ void EntryScreen::debut(Evt* e) {
     messageOk(kind_.noJournal);
   }
 
+  openLineSelections();
+
+  ecran()->commande(1, "Infos fiche");
+  for (Part* part : parts_) part->started();
+}
+
+void EntryScreen::openLineSelections() {
+  line().openSelection();
   CDTVA.initRequete();
   if (kind_.vatCodeFilter) CDTVA.ajouteFiltre(CDTVA_TYTVA, kind_.vatCodeFilter, kind_.vatCodeType);
   CDTVA.choisitIndex("COTVA");
   CDTVA.activeRequete();
-
-  ecran()->commande(1, "Infos fiche");
-  for (Part* part : parts_) part->started();
 }
 
 void EntryScreen::selection_tri(Evt* e) {
@@ -605,15 +610,18 @@ void EntryScreen::avant_suppression(Evt* e) {
 void EntryScreen::extraction_donnees(Evt* e) {
   Sdocum::extraction_donnees(e);
   procedure("EXTRACTION_TABLE_MIRVAANA");
+  for (Part* part : parts_) part->lineExtracted();
 }
 
 void EntryScreen::validation_donnees(Evt* e) {
   procedure("VALIDATION_TABLE_MIRVAANA");
+  for (Part* part : parts_) part->lineSaved();
   Sdocum::validation_donnees(e);
 }
 
 void EntryScreen::suppression_donnees(Evt* e) {
   procedure("SUPPRESSION_TABLE_MIRVAANA");
+  for (Part* part : parts_) part->lineDeleted();
   Sdocum::suppression_donnees(e);
 }
 

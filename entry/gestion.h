@@ -108,6 +108,13 @@ class Part {
   virtual void saving() {}
   // The operation was saved and posted.
   virtual void saved() {}
+  // The lines were totalled again: `ttc` is what they come to, taxes included.
+  virtual void linesTotalled(const Decimal& /*ttc*/) {}
+  // The data steps of one line, after its analytic rows: read from the dossier into
+  // the work tables, saved into the dossier, deleted from it.
+  virtual void lineExtracted() {}
+  virtual void lineSaved() {}
+  virtual void lineDeleted() {}
 
  protected:
   EntryScreen& s_;
@@ -138,6 +145,9 @@ class EntryScreen : public model::Gestion_document2 {
   virtual std::string vatChoiceType() { return kind_.vatChoiceType; }
   // The core's own handlers.
   virtual void provide(Handlers& handlers);
+  // At start, the line accounts and VAT codes the lists offer, by the kind's natures
+  // and VAT type. A kind whose natures follow each operation opens none.
+  virtual void openLineSelections();
 
   // ---- start, record, modes (lifecycle)
   void init(Evt* e) override;

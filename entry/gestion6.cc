@@ -35,7 +35,6 @@ AnyAccount::AnyAccount(EntryScreen& screen) : LineAccount(screen, "LST_VLIBCP", 
 }
 
 void AnyAccount::started() {
-  LineAccount::started();
   s_.V_SAISIE_COMPT = "NUMCP";
   VLIBNATUC = kAnyNature;
 }

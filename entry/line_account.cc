@@ -12,7 +12,7 @@ void LineAccount::provide(Handlers& handlers) {
   handlers.add(choose_branch_, &s_, &EntryScreen::chooseLineAccount);
 }
 
-void LineAccount::started() {
+void LineAccount::openSelection() {
   Table& t = accounts();
   t.initRequete();
   std::string nature = s_.lineNature();

@@ -24,8 +24,8 @@ class LineAccount : public Part {
   LineAccount(EntryScreen& screen, const char* labelControl, const char* chooseBranch);
 
   void provide(Handlers& handlers) override;
-  // The accounts the lines may take, by number.
-  void started() override;
+  // Opens the selection of the accounts the lines may take, by number.
+  void openSelection();
 
   const char* labelControl() const { return label_control_; }
   const char* chooseBranch() const { return choose_branch_; }
@@ -182,6 +182,87 @@ class StandardLabels : public Part {
   Table TYPLB{&s_, "", "TYPLB", ""};
   Champ TYPLB_CTYLB{"CTYLB", &TYPLB};
   Champ TYPLB_ITYLB{"ITYLB", &TYPLB};
+};
+
+// The bank or cash account of bank and cash operations, with the journal that keeps
+// it (JONAL.CPTRE), the operation's direction (TYPE_DR: "R" a receipt, "D" a
+// payment) and the account's running balance.
+//
+// The balance shown is the account's as it will stand once this operation is saved:
+// the ledger's over the exercise up to the closing date, less what the operation's
+// own posted piece put on the account (it is replaced at saving), plus the operation
+// as it now stands.
+class TreasuryAccount : public HeaderAccount {
+ public:
+  explicit TreasuryAccount(EntryScreen& screen);
+
+  void provide(Handlers& handlers) override;
+  void started() override;
+  void creationStarted() override;
+  void opened() override;
+  bool lineAccountAccepted(Evt* e, const std::string& account) override;
+  void lineAccountRead() override;
+  void linesTotalled(const Decimal& ttc) override;
+
+  void vlibcp1(Evt* e) override;
+  void type_dr(Evt* e);
+  void calcul_solde(Evt* e);
+  void afficher_solde(Evt* e);
+
+  bool payment() const { return MIRVAE_TYPE_DR == "D"; }
+  // The nature letter a line account must have: with lines on expense and revenue
+  // accounts (PRE19 "1"), a charge for a payment and a revenue for a receipt;
+  // otherwise a supplier for a payment and a client for a receipt.
+  std::string lineNature() const;
+  // The message for a line without account, by the same choice.
+  std::string lineAccountRequired() const;
+
+  Chaine V_CPTRE{"V_CPTRE", "", "", 0, &s_};
+  Chaine V_NUMCP_AVANT_MODIF{"V_NUMCP_AVANT_MODIF", "", "", 0, &s_};
+  Chaine V_NUMJL{"V_NUMJL", "", "", 0, &s_};
+  Chaine V_TSOLDE{"V_TSOLDE", "", "", 0, &s_};
+  Chaine V_TYPE_DR{"V_TYPE_DR", "", "", 0, &s_};
+  Monnaie V_SOLDE{"V_SOLDE", "", "", 0, &s_};
+  Monnaie V_SOLDE_INITIAL{"V_SOLDE_INITIAL", "", "", 0, &s_};
+  Monnaie V_TOT1_DR{"V_TOT1_DR", "", "", 0, &s_};
+  Monnaie V_TOT2_DR{"V_TOT2_DR", "", "", 0, &s_};
+  Champ JONAL_CPTRE{"CPTRE", &s_.JONAL};
+  Champ MIRVAE_TYPE_DR{&s_, "TYPE_DR", s_.table(false)};
+  Champ PARAM_PRE19{"PRE19", &s_.PARAM};
+  Champ PARAM_PFO13{"PFO13", &s_.PARAM};
+
+ private:
+  // The treasury journal of the account in COMPT1 into V_NUMJL and V_CPTRE (both
+  // empty when none keeps it); false when none does.
+  bool readJournal();
+};
+
+// The due dates a line settles (MIRVAJUS), kept in the session's work table
+// MIRVAJUS_M01 while the operation is entered and saved, read back and removed with
+// it, line by line.
+class JustificationRows : public Part {
+ public:
+  // The branches of the part, in the order they are registered.
+  static constexpr std::string_view kBranches[] = {"EXTRACTION_TABLE_MIRVAJUS", "SUPPRESSION_TABLE_MIRVAJUS",
+                                                   "VALIDATION_TABLE_MIRVAJUS"};
+
+  explicit JustificationRows(EntryScreen& screen);
+
+  void provide(Handlers& handlers) override;
+  void lineExtracted() override;
+  void lineSaved() override;
+  void lineDeleted() override;
+
+  void extraction_table_mirvajus(Evt* e);
+  void suppression_table_mirvajus(Evt* e);
+  void validation_table_mirvajus(Evt* e);
+  // Drops the working rows of the current line.
+  void discardWorkingRows();
+
+  Table MIRVAJUS{&s_, "", "MIRVAJUS", ""};
+  Table MIRVAJUS_M01{&s_, "", "MIRVAJUS_M01", ""};
+  Champ MIRVAJUS_IDENTR{"IDENTR", &MIRVAJUS};
+  Champ MIRVAJUS_M01_IDENTR{"IDENTR", &MIRVAJUS_M01};
 };
 
 }  // namespace entry

@@ -34,6 +34,7 @@ void VatTotals::calcul_totaux(Evt*) {
   V_TOT_TVA = tva;
   V_TOT_TTC = ttc;
   s_.ecran()->affiche("GRP_TOT", "");
+  for (Part* part : s_.parts_) part->linesTotalled(ttc);
 }
 
 }  // namespace entry

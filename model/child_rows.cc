@@ -4,14 +4,20 @@ namespace model {
 
 namespace {
 
-std::string prefix(const std::string& line) { return line + "|"; }
+// Selects the rows of `line` in `table`.
+void selectRows(host::Table& table, const LineKey& key, const std::string& line) {
+  table.initRequete();
+  if (key.form == LineKey::IdentAndBar)
+    table.ajouteFiltre(key.field, '/', line + "|");
+  else
+    table.ajouteFiltre(key.field, '=', line);
+}
 
 }  // namespace
 
-void copyChildRows(host::Table& from, host::Champ& fromNumero, host::Table& to, const std::string& line,
+void copyChildRows(host::Table& from, LineKey fromNumero, host::Table& to, const std::string& line,
                    const std::function<void()>& adjust) {
-  from.initRequete();
-  from.ajouteFiltre(fromNumero, '/', prefix(line));
+  selectRows(from, fromNumero, line);
   from.activeRequete();
   for (int rc = from.suivant(3); rc == 0; rc = from.suivant(1)) {
     to.raz();
@@ -23,11 +29,10 @@ void copyChildRows(host::Table& from, host::Champ& fromNumero, host::Table& to, 
   to.initRequete();
 }
 
-void convertChildRows(host::Table& table, host::Champ& numero, const std::string& line,
+void convertChildRows(host::Table& table, LineKey numero, const std::string& line,
                       std::initializer_list<host::Champ*> amounts,
                       const std::function<host::Decimal(const host::Decimal&)>& convert) {
-  table.initRequete();
-  table.ajouteFiltre(numero, '/', prefix(line));
+  selectRows(table, numero, line);
   table.activeRequete();
   for (int rc = table.suivant(3); rc == 0; rc = table.suivant(1)) {
     for (host::Champ* amount : amounts) *amount = convert(amount->decimal());
@@ -36,9 +41,8 @@ void convertChildRows(host::Table& table, host::Champ& numero, const std::string
   table.initRequete();
 }
 
-void removeChildRows(host::Table& table, host::Champ& numero, const std::string& line) {
-  table.initRequete();
-  table.ajouteFiltre(numero, '/', prefix(line));
+void removeChildRows(host::Table& table, LineKey numero, const std::string& line) {
+  selectRows(table, numero, line);
   table.vide();
   table.initRequete();
 }

@@ -4,6 +4,7 @@
 #include "entry/gestion1.h"
 #include "entry/gestion2.h"
 #include "entry/gestion3.h"
+#include "entry/gestion4.h"
 #include "entry/gestion6.h"
 #include "host/registry.h"
 #include "host/value.h"
@@ -80,11 +81,13 @@ void declarerUnites() {
   // Unit CREER_PIECE_BQ, GESTION4.
   static const Global creerPieceBqGlobal("MIRVAE", "MIRVAE");
   static const Module creerPieceBq("", "MIRVAE-CREER_PIECE_BQ", &host::fabriquer<MIRVAECreer_piece_bq>, false, "");
+  static const Module gestion4("", "MIRVAE-GESTION4", &host::fabriquer<MIRVAEGestion4>, false, "");
   static const Source creerPieceBqSource("MIRVAE", nullptr);
 
   // Unit CREER_PIECE_CA, GESTION5.
   static const Global creerPieceCaGlobal("MIRVAE", "MIRVAE");
   static const Module creerPieceCa("", "MIRVAE-CREER_PIECE_CA", &host::fabriquer<MIRVAECreer_piece_ca>, false, "");
+  static const Module gestion5("", "MIRVAE-GESTION5", &host::fabriquer<MIRVAEGestion5>, false, "");
   static const Source creerPieceCaSource("MIRVAE", nullptr);
 
   // Unit CREER_PIECE_OD, GESTION6.

@@ -61,6 +61,8 @@ struct OperationKind {
   const char* lineAccountRequired;
   // Pattern the line account choice window opens with ("625*"), "" for none.
   const char* lineAccountPattern = "";
+  // A bank or cash account chosen that no treasury journal keeps.
+  const char* accountWithoutJournal = "";
 
   // Names, made from the digit and the type.
   std::string accessModule() const { return "MIRVAE-ACCES" + std::to_string(number); }  // registry name

@@ -507,8 +507,8 @@ TEST_F(RegistreTest, UnitsDeclareInLoadOrder) {
       "Module MIRVAE-VERIFIER_MODIF_PIECE", "Source MIRVAE",
       "Global MIRVAE", "Module MIRVAE-CREER_PIECE_FF", "Module MIRVAE-GESTION2", "Source MIRVAE",
       "Global MIRVAE", "Module MIRVAE-CREER_PIECE_NDF", "Module MIRVAE-GESTION3", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_BQ", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_CA", "Source MIRVAE",
+      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_BQ", "Module MIRVAE-GESTION4", "Source MIRVAE",
+      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_CA", "Module MIRVAE-GESTION5", "Source MIRVAE",
       "Global MIRVAE", "Module MIRVAE-CREER_PIECE_OD", "Module MIRVAE-GESTION6", "Source MIRVAE",
       "Global COMPTA", "Global MIRVAE", "Module MIRVAE-INTERFACE", "Source MIRVAE"};
   // Modules the tests stand in for, when the library has not built them yet, come

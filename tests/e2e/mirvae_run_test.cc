@@ -138,6 +138,9 @@ TEST_F(MirvaeRunTest, TheDemoMakesItsDossierAndNeverReplacesAnotherFile) {
     // The last line is the grand total: nothing, when debits and credits match.
     std::string total = balance.out.substr(balance.out.find_last_of('-') + 1);
     EXPECT_EQ(total.find_first_not_of(" \n0"), std::string::npos) << balance.out;
+    // The bank account holds what its browser showed after the receipt: 1464.00, "D".
+    Outcome bank = run("hledger -f " + quote(journal) + " balance 512100 --no-total");
+    EXPECT_NE(bank.out.find("1464.00 EUR  512100"), std::string::npos) << bank.out;
   }
   std::filesystem::remove(journal);
 

@@ -1,6 +1,7 @@
 // What the entry screens of the kinds share and where they differ: their branch
-// tables, a new operation's defaults, the supplier's account natures, and the expense
-// note's counterparty and line labels.
+// tables, a new operation's defaults, the supplier's account natures, the expense
+// note's counterparty and line labels, and the direction, line accounts and running
+// balance of bank and cash operations.
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -37,6 +38,9 @@ TEST_F(KindsTest, EachKindRegistersEveryBranchOnceInItsOrder) {
       "MAJ_LIGNES_MEMOIRE",
   };
   const std::vector<std::string> models = {"V_CMODEL", "V_CMODEL_CHOISIR", "MODTE_CHOISIR", "MODTE_GENERER"};
+  const std::vector<std::string> treasury = {
+      "TYPE_DR", "CALCUL_SOLDE", "AFFICHER_SOLDE", "TYPLB_CHOISIR", "TESTS_VALIDATION", "BT_JUSTIF",
+      "APPEL_JUSTIFICATION", "EXTRACTION_TABLE_MIRVAJUS", "SUPPRESSION_TABLE_MIRVAJUS", "VALIDATION_TABLE_MIRVAJUS"};
   const struct {
     int kind;
     std::vector<std::string> left, added;
@@ -44,6 +48,8 @@ TEST_F(KindsTest, EachKindRegistersEveryBranchOnceInItsOrder) {
       {1, {}, {}},
       {2, {}, {}},
       {3, models, {"VTIERS1", "VTIERS1_FERME", "FAIT_INPIE", "TYPFR_CHOISIR", "LST_MIRVAL.LIBEC", "LIRE_LIGNE_PRECEDENTE"}},
+      {4, {}, treasury},
+      {5, {}, treasury},
       {6,
        {"VLIBCP1", "COMPT1_CHOISIR", "LST_VLIBCP2", "COMPT2_CHOISIR"},
        {"COMPT_CHOISIR", "LST_VLIBCP", "LST_VLIBSENS_DC", "CALCUL_DC", "TYPLB_CHOISIR", "TESTS_VALIDATION"}},
@@ -65,14 +71,18 @@ TEST_F(KindsTest, EachKindRegistersEveryBranchOnceInItsOrder) {
 }
 
 TEST_F(KindsTest, ANewOperationTakesItsKindsDefaults) {
+  // Bank and cash: the first account of the kind by number, the journal that keeps
+  // it, a receipt typed with its taxes, no due date.
   const struct {
     int kind;
-    const char *type, *journal, *label, *dueDate, *amountTyped;
+    const char *type, *journal, *label, *account, *dueDate, *amountTyped, *direction;
   } cases[] = {
-      {1, "FC", "VT", "Facture client n° ", "15/03/2024", "1"},
-      {2, "FF", "AC", "Facture fournisseur n° ", "15/03/2024", "1"},
-      {3, "NDF", "AC", "Note de frais personnel n° ", "15/03/2024", "1"},
-      {6, "OD", "OD", "Opération diverse", "", "2"},
+      {1, "FC", "VT", "Facture client n° ", "", "15/03/2024", "1", ""},
+      {2, "FF", "AC", "Facture fournisseur n° ", "", "15/03/2024", "1", ""},
+      {3, "NDF", "AC", "Note de frais personnel n° ", "", "15/03/2024", "1", ""},
+      {4, "BQ", "BQ1", "Opération bancaire", "512100", "", "2", "R"},
+      {5, "CA", "CA", "Opération de caisse", "530000", "", "2", "R"},
+      {6, "OD", "OD", "Opération diverse", "", "", "2", ""},
   };
   for (const auto& c : cases) {
     SCOPED_TRACE(c.kind);
@@ -80,8 +90,10 @@ TEST_F(KindsTest, ANewOperationTakesItsKindsDefaults) {
     ASSERT_TRUE(creer());
     EXPECT_EQ(valeur("MIRVAE.TYPE"), c.type);
     EXPECT_EQ(valeur("MIRVAE.NUMJL"), c.journal);
+    EXPECT_EQ(valeur("MIRVAE.NUMCP"), c.account);
     EXPECT_EQ(valeur("MIRVAE.DTECH"), c.dueDate);
     EXPECT_EQ(valeur("MIRVAE.SAISIE_MTT"), c.amountTyped);
+    EXPECT_EQ(valeur("MIRVAE.TYPE_DR"), c.direction);
     EXPECT_TRUE(valeur("MIRVAE.INPIE").starts_with(c.label)) << valeur("MIRVAE.INPIE");
     model::fermer(session());
   }
@@ -276,6 +288,130 @@ TEST_F(MiscellaneousTest, AModelGivesItsLinesSidesAndTheLastChecksStopAClosedAcc
   EXPECT_EQ(session().transcript().textes("dialogue").back().rfind("Information : Le compte suivant est interdit en saisie : 530000", 0), 0u);
   EXPECT_EQ(told.back().rfind("Un compte interdit en saisie ne reçoit plus d'écriture.", 0), 0u);
   EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE"), 0);
+}
+
+TEST_F(KindsTest, ABankLineTakesTheAccountOfItsDirectionTypedInFull) {
+  // With lines on expense and revenue accounts (PRE19 "1"), a receipt takes a revenue
+  // and a payment a charge; otherwise a client and a supplier.
+  const struct {
+    const char *pre19, *direction, *accepted, *refused, *refusal, *required;
+  } cases[] = {
+      {"1", "R", "706000", "601000", "Le compte n'est pas de nature <Produit> !",
+       "La saisie d'un compte Produit est obligatoire !"},
+      {"1", "D", "601000", "706000", "Le compte n'est pas de nature <Charge> !",
+       "La saisie d'un compte Charge est obligatoire !"},
+      {"", "R", "411001", "401001", "Le compte n'est pas de nature <Client> !",
+       "La saisie d'un compte Tiers est obligatoire !"},
+      {"", "D", "401001", "411001", "Le compte n'est pas de nature <Fournisseur> !",
+       "La saisie d'un compte Tiers est obligatoire !"},
+  };
+  kind_ = 4;
+  for (const auto& c : cases) {
+    SCOPED_TRACE(std::string(c.pre19) + c.direction);
+    sql("UPDATE PARAM SET PRE19 = '" + std::string(c.pre19) + "'");
+    ASSERT_TRUE(creer());
+    ASSERT_TRUE(saisir("MIRVAE.TYPE_DR", c.direction));
+    EXPECT_FALSE(ligne(c.refused, "100"));
+    EXPECT_EQ(dernierMessage(), c.refusal);
+    EXPECT_FALSE(saisir("LST_MIRVAL.NUMCP", std::string(c.accepted).substr(0, 3) + "*"));
+    EXPECT_EQ(dernierMessage(), "Vous devez choisir un n° de compte");
+    EXPECT_TRUE(saisir("LST_MIRVAL.NUMCP", c.accepted));
+    EXPECT_TRUE(saisir("LST_V_HT", "100"));
+    EXPECT_TRUE(model::validerLigne(session()));
+    EXPECT_FALSE(ligne("", "100"));
+    EXPECT_EQ(dernierMessage(), c.required);
+    model::fermer(session());
+  }
+}
+
+TEST_F(KindsTest, TheBankBalanceFollowsEachLineAndCountsASavedOperationOnce) {
+  kind_ = 4;
+  ASSERT_TRUE(creer());
+  EXPECT_EQ(valeur("V_SOLDE"), "0.00");
+  EXPECT_EQ(valeur("V_TSOLDE"), "");
+  // A receipt brings its lines in, a payment takes them out of what the ledger holds.
+  const struct {
+    const char *direction, *account, *amount, *balance, *side;
+  } steps[] = {
+      {"R", "411001", "1000", "1000.00", "D"},
+      {"R", "411002", "250.50", "1250.50", "D"},
+      {"D", "401001", "2000", "749.50", "C"},
+      {"D", "401002", "-749.50", "0.00", ""},
+  };
+  for (const auto& step : steps) {
+    SCOPED_TRACE(step.amount);
+    if (valeur("MIRVAE.TYPE_DR") != step.direction) {
+      // The receipt is saved: the payment starts from the ledger's balance.
+      ASSERT_TRUE(enregistrer("2"));
+      ASSERT_TRUE(saisir("MIRVAE.TYPE_DR", step.direction));
+      EXPECT_EQ(valeur("V_SOLDE"), "1250.50");
+    }
+    ASSERT_TRUE(ligne(step.account, step.amount));
+    EXPECT_EQ(valeur("V_SOLDE"), step.balance);
+    EXPECT_EQ(valeur("V_TSOLDE"), step.side);
+  }
+  model::fermer(session());
+  // The saved receipt, opened again, is not counted beside its own posted piece.
+  std::string receipt = sql("SELECT IDENT FROM MIRVAE WHERE TYPE = 'BQ'");
+  ASSERT_TRUE(ouvrirFiche(receipt, "VMCAm"));
+  EXPECT_EQ(valeur("V_SOLDE"), "1250.50");
+  EXPECT_EQ(valeur("V_TSOLDE"), "D");
+}
+
+TEST_F(KindsTest, AReceiptAndAPaymentPostTheirLinesAgainstTheAccount) {
+  // Lines on revenue and charges; a receipt's VAT on sales owed on receipts (the
+  // service's TPTVA "E"), a payment's deductible.
+  sql("UPDATE PARAM SET PRE19 = '1'");
+  const struct {
+    int kind;
+    const char *direction, *account, *amount, *posted;
+  } cases[] = {
+      {4, "R", "706000", "120", "445800 0 20, 512100 120 0, 706000 0 100"},
+      {5, "D", "606400", "60", "445660 10 0, 530000 0 60, 606400 50 0"},
+      {5, "D", "627000", "-15", "530000 15 0, 627000 0 15"},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.account);
+    kind_ = c.kind;
+    ASSERT_TRUE(creer());
+    ASSERT_TRUE(saisir("MIRVAE.TYPE_DR", c.direction));
+    ASSERT_TRUE(ligne(c.account, c.amount));
+    ASSERT_TRUE(enregistrer());
+    std::string piece = sql("SELECT NPIES FROM MIRVAE WHERE IDENT = (SELECT max(IDENT) FROM MIRVAE)");
+    ASSERT_FALSE(piece.empty());
+    EXPECT_EQ(sql("SELECT group_concat(NUMCP || ' ' || MTDEBS || ' ' || MTCRES, ', ') FROM (SELECT * FROM MOUVE "
+                  "WHERE NPIES = '" + piece + "' ORDER BY NUMCP)"),
+              c.posted);
+    model::fermer(session());
+  }
+  EXPECT_TRUE(testing_support::incoherences(base()).empty());
+}
+
+TEST_F(KindsTest, ALineAccountClosedOrGoneBeforeSavingStopsTheSave) {
+  const struct {
+    const char *account, *change, *dialogue, *shown;
+  } cases[] = {
+      {"411001", "UPDATE COMPT SET CCTRA = 'O' WHERE NUMCP = '411001'",
+       "Information : Le compte suivant est interdit en saisie : 411001 | 1~OK | 2~Voir le mémo",
+       "Un compte interdit en saisie ne reçoit plus d'écriture."},
+      {"411002", "DELETE FROM COMPT WHERE NUMCP = '411002'", "", "Le compte suivant est inexistant : 411002"},
+  };
+  kind_ = 4;
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.change);
+    ASSERT_TRUE(creer());
+    ASSERT_TRUE(ligne(c.account, "80"));
+    sql(c.change);
+    user_.ajouterDialogue("1");
+    if (*c.dialogue) user_.ajouterDialogue("2");  // sees the memo
+    appuyer("B_VALID_DOC");
+    if (*c.dialogue) {
+      EXPECT_EQ(session().transcript().textes("dialogue").back(), c.dialogue);
+    }
+    EXPECT_TRUE(dernierMessage().starts_with(c.shown)) << dernierMessage();
+    EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE"), 0);
+    model::fermer(session());
+  }
 }
 
 }  // namespace
