@@ -7,8 +7,8 @@
 // its shortest decimal text (fromDouble(19.6) is exactly 19.6).
 #pragma once
 
-#include <boost/multiprecision/cpp_int.hpp>
 #include <compare>
+#include <cstddef>
 #include <cstdint>
 #include <optional>
 #include <string>
@@ -20,8 +20,13 @@ class Decimal {
  public:
   static constexpr int kDivisionDecimals = 20;
 
-  Decimal() = default;
+  Decimal();  // zero
   Decimal(long long units);  // NOLINT(google-explicit-constructor): 0 and 100 read naturally
+  Decimal(const Decimal& other);
+  Decimal(Decimal&& other) noexcept;  // `other` stays usable: it may be assigned or destroyed
+  Decimal& operator=(const Decimal& other);
+  Decimal& operator=(Decimal&& other) noexcept;
+  ~Decimal();
 
   // Parses "119.60", "-0,125", "+3", " 12 ". Returns nothing for anything else
   // (empty text, letters, two separators, exponents).
@@ -46,8 +51,8 @@ class Decimal {
   // The integer part, towards zero; throws std::overflow_error beyond 64 bits.
   long long toInteger() const;
 
-  bool isZero() const { return mantissa_ == 0; }
-  int sign() const { return mantissa_ < 0 ? -1 : (mantissa_ > 0 ? 1 : 0); }
+  bool isZero() const;
+  int sign() const;  // -1, 0 or 1
   Decimal abs() const;
 
   Decimal operator-() const;
@@ -69,13 +74,20 @@ class Decimal {
   }
 
  private:
-  using Int = boost::multiprecision::cpp_int;
-  Decimal(Int mantissa, int scale) : mantissa_(std::move(mantissa)), scale_(scale) { normalize(); }
-  static int compare(const Decimal& a, const Decimal& b);
-  static Int pow10(int n);
-  void normalize();  // drops trailing zero decimals
+  // The mantissa is an integer of unbounded size, known only to decimal.cc so that
+  // the big-integer arithmetic is compiled once rather than in every file that
+  // handles money. It lives in place in storage_: a Decimal allocates nothing until
+  // its mantissa outgrows a couple of machine words.
+  struct Mantissa;
+  static constexpr std::size_t kMantissaSize = 32;
+  static constexpr std::size_t kMantissaAlignment = 16;
 
-  Int mantissa_ = 0;
+  Decimal(Mantissa mantissa, int scale);
+  Mantissa& mantissa() noexcept;
+  const Mantissa& mantissa() const noexcept;
+  static int compare(const Decimal& a, const Decimal& b);
+
+  alignas(kMantissaAlignment) std::byte storage_[kMantissaSize];
   int scale_ = 0;  // number of decimals, never negative
 };
 

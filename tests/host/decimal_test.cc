@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <string>
+#include <utility>
+
 namespace host {
 namespace {
 
@@ -40,6 +43,36 @@ TEST(Decimal, DivisionKeepsTwentyDecimals) {
   EXPECT_EQ((D("119.60") / D("1.196")).toFixed(2), "100.00");
   EXPECT_EQ((D("1") / D("3")).toString(0), "0.33333333333333333333");
   EXPECT_THROW(D("1") / Decimal(), std::domain_error);
+}
+
+TEST(Decimal, CopiesAndMovesKeepTheValue) {
+  // Small mantissas are held in place, a 41-digit one on the heap: every pairing of the
+  // two goes through each copy and move, including onto itself and onto a moved-from one.
+  const char* values[] = {"0", "-119.60", "1234567890123456789012345678901234567890.5"};
+  for (const char* from : values) {
+    for (const char* onto : values) {
+      SCOPED_TRACE(std::string(from) + " onto " + onto);
+      Decimal source = D(from);
+      Decimal copy(source);
+      copy += Decimal(1);
+      EXPECT_EQ(source, D(from));
+      Decimal assigned = D(onto);
+      assigned = source;
+      EXPECT_EQ(assigned, D(from));
+      Decimal moved(std::move(assigned));
+      EXPECT_EQ(moved, D(from));
+      assigned = D(onto);
+      EXPECT_EQ(assigned, D(onto));
+      Decimal target = D(onto);
+      target = std::move(moved);
+      EXPECT_EQ(target, D(from));
+      Decimal& self = target;
+      target = self;
+      EXPECT_EQ(target, D(from));
+      target = std::move(self);
+      EXPECT_EQ(target, D(from));
+    }
+  }
 }
 
 }  // namespace
