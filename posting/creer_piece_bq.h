@@ -15,10 +15,14 @@ class MIRVAECreer_piece_bq : public posting::PostingProcess {
   // `e` carries the IDENT of the operation to post.
   explicit MIRVAECreer_piece_bq(host::Evt* e);
 
-  // The settlement of the due dates justified on the operation. It has no body yet:
-  // the settlement of a due date and the piece of its currency differences come with
-  // the justification of settlements.
+  // The settlement of the due dates justified on the operation: for each posted line
+  // (an amount and its ledger movement), each of its justification rows (MIRVAJUS)
+  // goes through "JUSTIFICATION_ECHEANCE". The differences of those settlements are
+  // gathered in EAEUR, emptied first.
   void fait_justification(host::Evt* e);
+  // Settles one justified due date. Until settlements can be made, a justified due
+  // date refuses the save: the operation is not posted without its settlements.
+  void justification_echeance(host::Evt* e);
 
  protected:
   // For the cash operation, which posts the same way; `counterpart` names the
@@ -33,6 +37,14 @@ class MIRVAECreer_piece_bq : public posting::PostingProcess {
   void afterPiece() override;
 
   host::Champ MIRVAE_TYPE_DR{this, "TYPE_DR", table(false)};
+  host::Table PIECE{this, "", "PIECE", ""};
+  host::Table MOUVE{this, "", "MOUVE", ""};
+  host::Table MIRVAJUS{this, "", "MIRVAJUS", ""};
+  host::Table EAEUR{this, "", "EAEUR", ""};
+  host::Champ PIECE_NPIES{"NPIES", &PIECE};
+  host::Champ MOUVE_UNIQ{"UNIQ", &MOUVE};
+  host::Champ MIRVAJUS_IDENTR{"IDENTR", &MIRVAJUS};
+  host::Champ MIRVAJUS_NUSYS{"NUSYS", &MIRVAJUS};
 
  private:
   const char* counterpart_;

@@ -259,7 +259,7 @@ TEST_F(MiscellaneousTest, AVatAccountTakesItsAmountAsVatAndAnUnbalancedPieceIsRe
   EXPECT_TRUE(testing_support::incoherences(base()).empty());
 }
 
-TEST_F(MiscellaneousTest, AModelGivesItsLinesSidesAndTheLastChecksStopAClosedAccount) {
+TEST_F(MiscellaneousTest, AModelGivesItsLinesSidesAndThePieceLabelComesFromTheStandardLabels) {
   ASSERT_TRUE(creer());
   ASSERT_TRUE(saisir("V_CMODEL", "ODCAISSE"));
   ASSERT_EQ(model::nombreLignes(session()), 2u);
@@ -278,16 +278,6 @@ TEST_F(MiscellaneousTest, AModelGivesItsLinesSidesAndTheLastChecksStopAClosedAcc
   user_.ajouterChoix("APPRO");
   ASSERT_TRUE(model::ouvrirChoix(session(), "MIRVAE.INPIE"));
   EXPECT_EQ(valeur("MIRVAE.INPIE"), "Approvisionnement de la caisse");
-  // An account closed to entries since it was typed: the user may read why.
-  sql("UPDATE COMPT SET CCTRA = 'O' WHERE NUMCP = '530000'");
-  user_.ajouterDialogue("1");  // save
-  user_.ajouterDialogue("2");  // see the memo
-  appuyer("B_VALID_DOC");
-  std::vector<std::string> told = messages();
-  ASSERT_GE(told.size(), 1u);
-  EXPECT_EQ(session().transcript().textes("dialogue").back().rfind("Information : Le compte suivant est interdit en saisie : 530000", 0), 0u);
-  EXPECT_EQ(told.back().rfind("Un compte interdit en saisie ne reçoit plus d'écriture.", 0), 0u);
-  EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE"), 0);
 }
 
 TEST_F(KindsTest, ABankLineTakesTheAccountOfItsDirectionTypedInFull) {

@@ -346,6 +346,24 @@ TEST_F(CreerPieceTest, NpiesReplacedAsSoonAsDebutPieceSucceeds) {
   EXPECT_EQ(npies("OP000002"), "00000000999");
 }
 
+TEST_F(CreerPieceTest, ABankLineWithAJustifiedDueDateIsNotPostedWithoutItsSettlement) {
+  ecrire({.type = "BQ", .lignes = {{"411001", "120"}, {"706000", "30"}}, .numcp = "512100", .numjl = "BQ1",
+          .typeDr = "R"});
+  // Due date 42 of the client is justified on the first line; the second has none.
+  sql("INSERT INTO MIRVAJUS (IDENTR, NUSYS, MTREG) SELECT IDENT, 42, '120' FROM MIRVAL WHERE NUMCP = '411001'");
+  poster("OP000001", "BQ");
+  std::vector<std::string> errors = session().transcript().textes("erreur");
+  ASSERT_FALSE(errors.empty());
+  EXPECT_NE(errors.back().find("L'échéance n° 42 est justifiée sur cette opération"), std::string::npos)
+      << errors.back();
+  EXPECT_EQ(compte("SELECT count(*) FROM PIECE"), 0);
+  EXPECT_EQ(compte("SELECT count(*) FROM MOUVE"), 0);
+
+  sql("DELETE FROM MIRVAJUS");
+  poster("OP000001", "BQ");
+  EXPECT_EQ(compte("SELECT count(*) FROM PIECE"), 1);
+}
+
 TEST_F(CreerPieceTest, LedgerUnreachableStopsWithOneMessage) {
   ecrire({.lignes = {{"706000", "100", "20", "V20"}}});
   echouer("DEBUT_IMPORT", 1, 1);
