@@ -1,6 +1,7 @@
 #include "registry/library.h"
 
 #include "access/acces.h"
+#include "analytic/gest_ana.h"
 #include "entry/gestion1.h"
 #include "entry/gestion2.h"
 #include "entry/gestion3.h"
@@ -95,6 +96,11 @@ void declarerUnites() {
   static const Module creerPieceOd("", "MIRVAE-CREER_PIECE_OD", &host::fabriquer<MIRVAECreer_piece_od>, false, "");
   static const Module gestion6("", "MIRVAE-GESTION6", &host::fabriquer<MIRVAEGestion6>, false, "");
   static const Source creerPieceOdSource("MIRVAE", nullptr);
+
+  // Unit GEST_ANA.
+  static const Global gestAnaGlobal("MIRVAE", "MIRVAE");
+  static const Module gestAna("", "MIRVAE-GEST_ANA", &host::fabriquer<analytic::MIRVAEGest_ana>, false, "");
+  static const Source gestAnaSource("MIRVAE", nullptr);
 
   // Unit INTERFACE: it also works with the globals of the general-ledger library.
   static const Global interfaceComptaGlobal("COMPTA", "MIRVAE");

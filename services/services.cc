@@ -1,6 +1,7 @@
 #include "services/services.h"
 
 #include "host/registry.h"
+#include "services/analytics.h"
 #include "services/compta.h"
 #include "services/cpcdtva.h"
 #include "services/cpcompt.h"
@@ -31,6 +32,9 @@ void chargerServices() {
   Module("", "CPCOMPT-INTERFACE", &fabriquer<Cpcompt>, false, "");
   Module("", "CPCDTVA-INTERFACE", &fabriquer<Cpcdtva>, false, "");
   Module("", "CPPARAM-INTERFACE", &fabriquer<Cpparam>, false, "");
+  Module("", "CPPOANA-INTERFACE", &fabriquer<Cppoana>, false, "");
+  Module("", "CPCRITA-INTERFACE", &fabriquer<Cpcrita>, false, "");
+  Module("", "CPSECAN-INTERFACE", &fabriquer<Cpsecan>, false, "");
   Module("", "MONNAIE-INTERFACE", &fabriquer<Monnaie>, false, "");
   Module("", "ZEFNDOC-INTERFACE", &fabriquer<Zefndoc>, false, "");
   Module("", "ZEFMDS-NETTOYAGE_PARAMLST1_LISTE", &fabriquer<Nettoyage_paramlst1_liste>, false, "");

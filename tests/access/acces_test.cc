@@ -510,6 +510,7 @@ TEST_F(RegistreTest, UnitsDeclareInLoadOrder) {
       "Global MIRVAE", "Module MIRVAE-CREER_PIECE_BQ", "Module MIRVAE-GESTION4", "Source MIRVAE",
       "Global MIRVAE", "Module MIRVAE-CREER_PIECE_CA", "Module MIRVAE-GESTION5", "Source MIRVAE",
       "Global MIRVAE", "Module MIRVAE-CREER_PIECE_OD", "Module MIRVAE-GESTION6", "Source MIRVAE",
+      "Global MIRVAE", "Module MIRVAE-GEST_ANA", "Source MIRVAE",
       "Global COMPTA", "Global MIRVAE", "Module MIRVAE-INTERFACE", "Source MIRVAE"};
   // Modules the tests stand in for, when the library has not built them yet, come
   // after the library's own declarations.

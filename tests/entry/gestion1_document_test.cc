@@ -8,6 +8,7 @@
 
 #include <gtest/gtest.h>
 
+#include "host/error.h"
 #include "host/registry.h"
 #include "model/impetat.h"
 #include "model/impression.h"
@@ -299,8 +300,13 @@ class ReplacementTest : public DocumentTest {
 
 TEST_F(ReplacementTest, ASaveWhoseLineCannotBeValidatedChangesNothing) {
   facturePosteeEnModification();
-  // The line's account takes analytics, whose screen cannot be reached: the line is
-  // not validated, and the save that had to validate it first does not happen.
+  // The line's account takes analytics, whose screen fails to open: the line is not
+  // validated, and the save that had to validate it first does not happen.
+  auto failing = [](host::Evt*) -> const host::Automate* { throw host::HostError("écran indisponible"); };
+  struct Unreachable {
+    host::Fabrique kept;
+    ~Unreachable() { host::Registre::instance().substituer("MIRVAE-GEST_ANA", kept); }
+  } unreachable{host::Registre::instance().substituer("MIRVAE-GEST_ANA", failing)};
   ASSERT_TRUE(model::allerLigne(session(), 1));
   ASSERT_TRUE(saisir("LST_V_HT", "1600"));
   EXPECT_FALSE(appuyer("B_VALID_DOC"));
