@@ -90,6 +90,12 @@ void MIRVAEGest_ana::nouvelIdentifiant(Donnee& ident) {
   appelerProcedure("*", "ZEFNDOC", "INTERFACE", "VALIDE_NUMERO", &params, -1);
 }
 
+void MIRVAEGest_ana::openForChange() {
+  // The screen opens in modification: only a model that asks for the change to be
+  // announced gets it.
+  if (aBranche("CTRL_DEBUT_MODIF")) appelerProcedure("", "", "", "CTRL_DEBUT_MODIF", nullptr, 0);
+}
+
 void MIRVAEGest_ana::selectStoredRows() {
   MIRVAANA_M01.initRequete();
   MIRVAANA_M01.ajouteFiltre(MIRVAANA_M01_NUMERO, '/', PIDENT.chaine() + "|");
@@ -331,7 +337,7 @@ void MIRVAEGest_ana::v_ccrit(Evt* e) {
 void MIRVAEGest_ana::cppoana_choisir(Evt*) {
   if (consultation()) return messageOk("Opération interdite en mode visualisation !");
   lire(kPosts, "CHOIX", V_CPOST, I_CPPOANA);
-  appelerProcedure("", "", "", "CTRL_DEBUT_MODIF", nullptr, 0);
+  openForChange();
   if (I_CPPOANA_LPOST.chaine().empty()) {
     I_CPPOANA.raz();
     V_CPOST = "";
@@ -342,7 +348,7 @@ void MIRVAEGest_ana::cppoana_choisir(Evt*) {
 void MIRVAEGest_ana::cpcrita_choisir(Evt*) {
   if (consultation()) return messageOk("Opération interdite en mode visualisation !");
   lire(kKeys, "CHOIX", V_CCRIT, I_CPCRITA);
-  appelerProcedure("", "", "", "CTRL_DEBUT_MODIF", nullptr, 0);
+  openForChange();
   if (I_CPCRITA_LCRIT.chaine().empty()) {
     I_CPCRITA.raz();
     V_CCRIT = "";

@@ -124,6 +124,7 @@ class MIRVAEGest_ana : public model::Gestion_document2 {
   // reads the record it left; false (blank record) when there is none.
   bool lire(const char* module, const char* procedure, Donnee& code, Table& record);
   void nouvelIdentifiant(Donnee& ident);
+  void openForChange();
   // Why a key's section is left out of a spread ("" when it is taken).
   std::string keySectionRefusal(const std::string& section);
   // The key's spread: for each section kept, `add` gets the section and its amount.

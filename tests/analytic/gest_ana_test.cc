@@ -109,3 +109,118 @@ TEST_F(GestAnaTest, AKeySpreadsTheLineAtStartAndTheFirstRowTakesTheRounding) {
 }
 
 }  // namespace
+
+namespace {
+
+TEST_F(GestAnaTest, ValidationWantsTheRowsToTotalTheMovement) {
+  struct Cas {
+    const char* cas;
+    Appel appel;
+    std::vector<std::pair<const char*, const char*>> typed;  // section, amount
+    bool saved;
+    const char* message;
+  };
+  const Cas cases[] = {
+      {"mouvement nul obligatoire", {.mandatory = "O"}, {}, true, ""},
+      {"aucune ligne, facultative", {.debit = "100"}, {}, true, ""},
+      {"obligatoire sans poste", {.debit = "100", .mandatory = "O"}, {}, false,
+       "La saisie de la ventilation analytique est obligatoire pour ce compte !"},
+      {"total exact", {.debit = "100"}, {{"ATELIER", "60"}, {"CHANTIER", "40"}}, true, ""},
+      {"un centime de moins", {.debit = "100"}, {{"ATELIER", "60"}, {"CHANTIER", "39.99"}}, false,
+       "Le total ventilé est différent du montant du mouvement !"},
+  };
+  for (const Cas& c : cases) {
+    SCOPED_TRACE(c.cas);
+    if (&c != cases) {
+      TearDown();
+      SetUp();
+    }
+    bool saved = false;
+    ASSERT_TRUE(ouvrir(c.appel, [&](Session& s) {
+      for (const auto& [section, amount] : c.typed) ASSERT_TRUE(row(s, section, amount));
+      saved = model::appuyer(s, "VALID_DOC");
+    }));
+    EXPECT_EQ(saved, c.saved);
+    EXPECT_EQ(messages().empty() ? "" : messages().back(), std::string(c.message));
+  }
+}
+
+TEST_F(GestAnaTest, ASectionIsTakenOnceAndOnlyWhileOpenAtTheOperationDate) {
+  sql("UPDATE SECAN SET DTCLO = '2024-01-31' WHERE CSECT = 'ADMIN'");
+  sql("INSERT INTO SECAN VALUES ('FUTUR', 'Futur', 'N', 'N', '2025-01-01', '')");
+  sql("INSERT INTO SECAN VALUES ('LIBRE', 'Toujours ouverte', 'O', 'O', '2025-01-01', '2020-01-01')");
+  const std::pair<const char*, const char*> cases[] = {
+      {"ATELIER", "La section a déjà été saisie !"},
+      {"SALON19", "Cette section est clôturée...Saisie impossible !"},
+      {"FUTUR", "La date d'ouverture de la section est postérieure à la date d'opération...Saisie impossible !"},
+      {"ADMIN", "La date de clôture de la section est antérieure à la date d'opération...Saisie impossible "},
+      {"ZZZ", "La section est inexistante !"},
+      {"LIBRE", ""},
+  };
+  ASSERT_TRUE(ouvrir({.debit = "100"}, [&](Session& s) {
+    ASSERT_TRUE(row(s, "ATELIER", "60"));
+    // The row being changed may keep its own section.
+    ASSERT_TRUE(model::allerLigne(s, 1));
+    EXPECT_TRUE(saisir(s, "LST_MIRVAANA_M01.CSECT", "ATELIER"));
+    ASSERT_TRUE(model::validerLigne(s));
+    ASSERT_TRUE(model::nouvelleLigne(s));
+    for (const auto& [section, message] : cases) {
+      SCOPED_TRACE(section);
+      std::size_t seen = messages().size();
+      EXPECT_EQ(saisir(s, "LST_MIRVAANA_M01.CSECT", section), *message == '\0');
+      EXPECT_EQ(messages().size() == seen ? "" : messages().back(), std::string(message));
+    }
+  }));
+}
+
+TEST_F(GestAnaTest, TheBalanceButtonGivesWhatIsMissingAndNeverLess) {
+  ASSERT_TRUE(ouvrir({.credit = "100"}, [&](Session& s) {
+    ASSERT_TRUE(row(s, "ATELIER", "60"));
+    ASSERT_TRUE(model::nouvelleLigne(s) && saisir(s, "LST_MIRVAANA_M01.CSECT", "CHANTIER"));
+    ASSERT_TRUE(model::appuyer(s, "BT_SOLDE"));
+    EXPECT_EQ(model::valeur(s, "LST_V_MTANA"), "40.00");
+    ASSERT_TRUE(saisir(s, "LST_V_MTANA", "50") && model::validerLigne(s));
+    ASSERT_TRUE(model::nouvelleLigne(s) && saisir(s, "LST_MIRVAANA_M01.CSECT", "ADMIN"));
+    ASSERT_TRUE(model::appuyer(s, "BT_SOLDE"));
+    EXPECT_EQ(model::valeur(s, "LST_V_MTANA"), "0.00");
+    EXPECT_EQ(model::valeur(s, "V_RESTE_ANA"), "-10.00");
+  }));
+}
+
+// A negative line turned to the other side: the user sees and types the line's sign.
+TEST_F(GestAnaTest, TheSignShowsTheLineAsTypedAndStoresItOnTheMovementSide) {
+  ASSERT_TRUE(ouvrir({.credit = "100", .sign = -1}, [&](Session& s) {
+    EXPECT_EQ(model::valeur(s, "V_MTLIG"), "-100.00");
+    ASSERT_TRUE(row(s, "ATELIER", "-20"));
+    EXPECT_EQ(model::valeur(s, "V_TOT_ANA"), "-20.00");
+    ASSERT_TRUE(row(s, "CHANTIER", "-80"));
+    EXPECT_TRUE(model::appuyer(s, "VALID_DOC"));
+  }));
+  EXPECT_EQ(rows(), "ATELIER 0/20, CHANTIER 0/80");
+}
+
+TEST_F(GestAnaTest, RowsOfALineThatChangedSideAndAmountFollowIt) {
+  sql("INSERT INTO MIRVAANA_M01 VALUES ('A1', 'L1|000001', 'ATELIER', '10', '0'), "
+      "('A2', 'L1|000002', 'CHANTIER', '10', '0'), ('A3', 'L1|000003', 'ADMIN', '10', '0')");
+  ASSERT_TRUE(ouvrir({.credit = "100"}));
+  EXPECT_EQ(rows(), "ATELIER 0/33.34, CHANTIER 0/33.33, ADMIN 0/33.33");
+}
+
+TEST_F(GestAnaTest, ChoosingAKeyReplacesTheRowsAndConsultationRefusesEveryChooser) {
+  user_.ajouterChoix("EGAL");
+  ASSERT_TRUE(ouvrir({.debit = "100", .section = "ATELIER"}, [&](Session& s) {
+    EXPECT_TRUE(model::appuyer(s, "CPCRITA_CHOISIR")) << s.transcript().rendu();
+    EXPECT_TRUE(model::appuyer(s, "VALID_DOC"));
+  }));
+  EXPECT_EQ(rows(), "ADMIN 33.34/0, ATELIER 33.33/0, CHANTIER 33.33/0");
+  EXPECT_EQ(key, "EGAL");
+
+  for (const char* chooser : {"CPPOANA_CHOISIR", "CPCRITA_CHOISIR", "CPSECAN_CHOISIR"}) {
+    SCOPED_TRACE(chooser);
+    ASSERT_TRUE(ouvrir({.debit = "100", .mode = "Vv"}, [&](Session& s) { model::appuyer(s, chooser); }));
+    EXPECT_EQ(messages().back(), "Opération interdite en mode visualisation !");
+  }
+  EXPECT_EQ(rows(), "ADMIN 33.34/0, ATELIER 33.33/0, CHANTIER 33.33/0");
+}
+
+}  // namespace
