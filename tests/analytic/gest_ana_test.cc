@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "model/mains.h"
+#include "tests/entry/gestion1_fixture.h"
 #include "tests/services/appelant.h"
 
 namespace {
@@ -221,6 +222,28 @@ TEST_F(GestAnaTest, ChoosingAKeyReplacesTheRowsAndConsultationRefusesEveryChoose
     EXPECT_EQ(messages().back(), "Opération interdite en mode visualisation !");
   }
   EXPECT_EQ(rows(), "ADMIN 33.34/0, ATELIER 33.33/0, CHANTIER 33.33/0");
+}
+
+}  // namespace
+
+namespace {
+
+// A client invoice on a sales account with a key: the spread proposed when the
+// analytic screen opens is kept with the operation and reaches the ledger with its
+// movement.
+class AnalyticRoadTest : public testing_support::Gestion1Test {};
+
+TEST_F(AnalyticRoadTest, TheRowsWrittenAtStartReachTheLedgerWithTheirMovement) {
+  user_.ajouterPilotage([](Session& s, Automate&) { model::appuyer(s, "VALID_DOC"); });
+  ASSERT_TRUE(creer() && client() && ligne("707000", "100") && model::allerLigne(session(), 1));
+  ASSERT_TRUE(appuyer("BT_ANALYTIQUE"));
+  ASSERT_TRUE(enregistrer("1")) << session().transcript().rendu();
+  EXPECT_EQ(sql("SELECT group_concat(CSECT || ' ' || MTACR, ', ') FROM (SELECT * FROM MIRVAANA ORDER BY NUMERO)"),
+            "ATELIER 60, CHANTIER 40") << session().transcript().rendu();
+  EXPECT_EQ(sql("SELECT group_concat(V.CSECT || ' ' || V.MTACR || ' ' || M.MTCRE, ', ') FROM VTSEC V "
+                "JOIN MOUVE M ON M.UNIQ = V.MOUVE_UNIQ"),
+            "ATELIER 60 100, CHANTIER 40 100");
+  EXPECT_TRUE(testing_support::incoherences(base()).empty());
 }
 
 }  // namespace
