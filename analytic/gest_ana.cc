@@ -130,9 +130,9 @@ void MIRVAEGest_ana::debut(Evt* e) {
   V_MTLIG = (P_MTDEBS.decimal() + P_MTCRES.decimal()) * Decimal(P_SIGNE.entier());
   V_CPOST = P_CPOST;
   V_CCRIT = P_CCRIT;
-  if (P_CPOST.estVide() || P_CPOST.chaine().empty()) I_CPPOANA.raz();
+  if (P_CPOST.chaine().empty()) I_CPPOANA.raz();
   else lire(kPosts, "LECTURE", V_CPOST, I_CPPOANA);
-  if (P_CCRIT.estVide() || P_CCRIT.chaine().empty()) I_CPCRITA.raz();
+  if (P_CCRIT.chaine().empty()) I_CPCRITA.raz();
   else lire(kKeys, "LECTURE", V_CCRIT, I_CPCRITA);
 
   table(false)->initRequete();
