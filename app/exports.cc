@@ -124,6 +124,17 @@ void imprimerGrandLivre(host::Database& db, std::ostream& out) {
       listing << "    " << column(row.text(1), 16, 16) << column(row.text(2), 10, 10) << column(row.text(3), 36, 34)
               << std::right << std::setw(14) << (debit.isZero() ? "" : host::amountText(debit, decimals))
               << std::setw(14) << (credit.isZero() ? "" : host::amountText(credit, decimals)) << "\n";
+      // The movement's analytic rows, each on its side.
+      Statement& a = db.prepare("SELECT CSECT, MTADE, MTACR FROM VTSEC WHERE MOUVE_UNIQ = ? ORDER BY UNIQ");
+      a.bind(1, m.integer(0));
+      while (a.step()) {
+        StoredRow section("VTSEC", a);
+        Decimal sectionDebit = section.amount(1), sectionCredit = section.amount(2);
+        listing << "    " << std::left << std::setw(26) << "" << column("section " + section.text(0), 36, 34)
+                << std::right << std::setw(14) << (sectionDebit.isZero() ? "" : host::amountText(sectionDebit, decimals))
+                << std::setw(14) << (sectionCredit.isZero() ? "" : host::amountText(sectionCredit, decimals)) << "\n";
+      }
+      a.reset();
     }
     m.reset();
     Statement& e = db.prepare("SELECT NUSYS, DTECH, MTECH FROM ECHEA WHERE NPIES = ? ORDER BY NUSYS");

@@ -3,9 +3,11 @@
 #include <gtest/gtest.h>
 
 #include <functional>
+#include <sstream>
 #include <string>
 #include <vector>
 
+#include "app/exports.h"
 #include "model/mains.h"
 #include "tests/entry/gestion1_fixture.h"
 #include "tests/services/appelant.h"
@@ -244,6 +246,11 @@ TEST_F(AnalyticRoadTest, TheRowsWrittenAtStartReachTheLedgerWithTheirMovement) {
                 "JOIN MOUVE M ON M.UNIQ = V.MOUVE_UNIQ"),
             "ATELIER 60 100, CHANTIER 40 100");
   EXPECT_TRUE(testing_support::incoherences(base()).empty());
+  // The printed ledger shows the rows under their movement.
+  std::ostringstream ledger;
+  app::imprimerGrandLivre(base(), ledger);
+  EXPECT_NE(ledger.str().find("section ATELIER"), std::string::npos) << ledger.str();
+  EXPECT_NE(ledger.str().find("section CHANTIER"), std::string::npos) << ledger.str();
 }
 
 }  // namespace
