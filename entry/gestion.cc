@@ -215,6 +215,25 @@ void EntryScreen::refuser(Evt* e, const std::string& message, const char* contro
   erreurMethode(1, e);
 }
 
+bool EntryScreen::chooseStandardText(const char* module, Table& table, Champ& code, Champ& label, Donnee& target) {
+  if (enVisualisation()) {
+    messageOk("Opération interdite en mode visualisation !");
+    return false;
+  }
+  Chaine PIDENT("PIDENT", "", "", 4, this), PERREUR("PERREUR", "", "", 4, this);
+  EvtParamRef choix(2, &PIDENT, &PERREUR);
+  appelerModule("COMPTA", "COMPTA", module, &choix);
+  EvtParamVal liste(1, "LST");
+  procedure("CTRL_DEBUT_MODIF_LISTE", &liste);
+  if (PERREUR == "0") {
+    lireOuVider(table, code, PIDENT);
+    target = label;
+  } else if (PERREUR == "2") {
+    target = "";
+  }
+  return true;
+}
+
 bool EntryScreen::lireOuVider(Table& t, Champ& field, const Donnee& value) {
   if (t.lit(3, field, '=', value) == 0) return true;
   t.raz();

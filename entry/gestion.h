@@ -265,6 +265,10 @@ class EntryScreen : public model::Gestion_document2 {
   void refuser(Evt* e, const std::string& message, const char* control);
   bool enCreation() const { return modeCourant() == "C"; }
   bool enVisualisation() const { return modeCourant() == "V"; }
+  // Fills `target` with a text of a table of standard texts (`table`: `code`, `label`)
+  // chosen in the window of the accounting module `module`: the chosen label, or empty
+  // when the user asked for none. False, with nothing done, in consultation.
+  bool chooseStandardText(const char* module, Table& table, Champ& code, Champ& label, Donnee& target);
   // Reads `t` where `field` = `value`; blanks its record when there is none.
   static bool lireOuVider(Table& t, Champ& field, const Donnee& value);
   // The operation's journal into JONAL (blank when unknown). The screen's journal

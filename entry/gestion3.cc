@@ -115,21 +115,7 @@ void MIRVAEGestion3::ctrl_ouvre(Evt* e) {
 
 // The line label from the expense types.
 void MIRVAEGestion3::typfr_choisir(Evt*) {
-  if (enVisualisation()) {
-    messageOk("Opération interdite en mode visualisation !");
-    return;
-  }
-  Chaine PIDENT("PIDENT", "", "", 4, this), PERREUR("PERREUR", "", "", 4, this);
-  EvtParamRef choix(2, &PIDENT, &PERREUR);
-  appelerModule("COMPTA", "COMPTA", "CHOIX_TABLE_TYPFR", &choix);
-  EvtParamVal liste(1, "LST");
-  procedure("CTRL_DEBUT_MODIF_LISTE", &liste);
-  if (PERREUR == "0") {
-    lireOuVider(TYPFR, TYPFR_CTYFR, PIDENT);
-    MIRVAL_LIBEC = TYPFR_ITYFR;
-  } else if (PERREUR == "2") {
-    MIRVAL_LIBEC = "";
-  }
+  if (!chooseStandardText("CHOIX_TABLE_TYPFR", TYPFR, TYPFR_CTYFR, TYPFR_ITYFR, MIRVAL_LIBEC)) return;
   afficherLigne();
 }
 

@@ -21,21 +21,7 @@ bool StandardLabels::documentAccepted(Evt*) {
 }
 
 void StandardLabels::typlb_choisir(Evt*) {
-  if (s_.enVisualisation()) {
-    s_.messageOk("Opération interdite en mode visualisation !");
-    return;
-  }
-  Chaine PIDENT("PIDENT", "", "", 4, &s_), PERREUR("PERREUR", "", "", 4, &s_);
-  EvtParamRef choix(2, &PIDENT, &PERREUR);
-  s_.appelerModule("COMPTA", "COMPTA", "CHOIX_TABLE_TYPLB", &choix);
-  EvtParamVal liste(1, "LST");
-  s_.procedure("CTRL_DEBUT_MODIF_LISTE", &liste);
-  if (PERREUR == "0") {
-    EntryScreen::lireOuVider(TYPLB, TYPLB_CTYLB, PIDENT);
-    s_.MIRVAE_INPIE = TYPLB_ITYLB;
-  } else if (PERREUR == "2") {
-    s_.MIRVAE_INPIE = "";
-  }
+  if (!s_.chooseStandardText("CHOIX_TABLE_TYPLB", TYPLB, TYPLB_CTYLB, TYPLB_ITYLB, s_.MIRVAE_INPIE)) return;
   s_.ecran()->affiche("INPIE", "");
 }
 
