@@ -358,6 +358,7 @@ CREATE TABLE "MOUVE" (
   "MTDEB"          MONEY TEXT NOT NULL DEFAULT '0',
   "MTCRE"          MONEY TEXT NOT NULL DEFAULT '0',
   "RELET"          TEXT       NOT NULL DEFAULT '',  -- lettering code, '' when not lettered
+  "DTLET"          DATE TEXT  NOT NULL DEFAULT '',  -- day the lettering was made, '' when not lettered
   "RRAPB"          TEXT       NOT NULL DEFAULT '',  -- bank reconciliation mark, '' when not pointed
   "INDX2"          TEXT       NOT NULL DEFAULT '',  -- NUMCP || '|' || date: an account's movements
   PRIMARY KEY ("UNIQ")
