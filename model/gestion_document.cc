@@ -18,6 +18,7 @@ Gestion_document2::Gestion_document2(Evt* e) : Gestion_document(e) {
 }
 void Gestion_document2::avant_debut(Evt*) {}
 void Gestion_document2::ctrl_choisir(Evt*) {}
+void Gestion_document2::ctrl_ouvre(Evt* e) { executer("CTRL_CHOISIR", e); }
 void Gestion_document2::debut_fiche(Evt*) {}
 void Gestion_document2::creation2(Evt* e) {
   std::string mode = modeCourant();

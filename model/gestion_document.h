@@ -23,6 +23,10 @@ class Gestion_document2 : public Gestion_document {
   // "CTRL_CHOISIR": the user asks for the choice of a header control; parameter 0
   // is the control's name. The base has no choice window and does nothing.
   virtual void ctrl_choisir(Evt* e);
+  // "CTRL_OUVRE": a list column whose screen has no opener of its own offers the
+  // screen's choice ("CTRL_CHOISIR") for that column, so that a chooser written for a
+  // column is reached whichever way the user opens it.
+  void ctrl_ouvre(Evt* e) override;
   // "DEBUT_FICHE": a document is on screen (opened or created); the base does
   // nothing. Handlers call it first.
   virtual void debut_fiche(Evt* e);

@@ -176,6 +176,16 @@ TEST_F(GestAnaTest, ASectionIsTakenOnceAndOnlyWhileOpenAtTheOperationDate) {
   }));
 }
 
+// The user opens the section column's choice as any list column's: the sections come.
+TEST_F(GestAnaTest, TheSectionColumnOpensTheSectionChooser) {
+  user_.ajouterChoix("CHANTIER");
+  ASSERT_TRUE(ouvrir({.debit = "100"}, [&](Session& s) {
+    ASSERT_TRUE(model::nouvelleLigne(s));
+    EXPECT_TRUE(model::ouvrirChoix(s, "LST_MIRVAANA_M01.CSECT")) << s.transcript().rendu();
+    EXPECT_EQ(model::valeur(s, "LST_MIRVAANA_M01.CSECT"), "CHANTIER");
+  }));
+}
+
 TEST_F(GestAnaTest, TheBalanceButtonGivesWhatIsMissingAndNeverLess) {
   ASSERT_TRUE(ouvrir({.credit = "100"}, [&](Session& s) {
     ASSERT_TRUE(row(s, "ATELIER", "60"));
