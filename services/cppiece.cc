@@ -500,6 +500,18 @@ std::vector<std::string> PieceImport::faults(const Piece& piece) {
     else if (!scalar(db(), "SELECT 1 FROM \"COMPT\" WHERE \"NUMCP\" = ?", m.account))
       out.push_back(which + "le compte « " + m.account + " » n'existe pas.");
     if (auto why = host::text::flaw(m.label)) out.push_back(which + "le libellé est refusé : " + *why + ".");
+    if (!m.allocations.empty()) {
+      // The analytic rows spread the movement itself: on its side, to the cent.
+      Decimal spreadDebit, spreadCredit;
+      for (const Allocation& a : m.allocations) {
+        spreadDebit += a.debit;
+        spreadCredit += a.credit;
+      }
+      if (spreadDebit != m.debit || spreadCredit != m.credit)
+        out.push_back(which + "la ventilation analytique (débit " + spreadDebit.toString(2) + ", crédit " +
+                      spreadCredit.toString(2) + ") ne totalise pas le mouvement (débit " + m.debit.toString(2) +
+                      ", crédit " + m.credit.toString(2) + ").");
+    }
     debit += m.debit;
     credit += m.credit;
   }

@@ -183,6 +183,10 @@ TEST_F(CppieceTest, LedgerRefusesWhatItCannotAccept) {
        "La pièce en XXX ne peut être valorisée en EUR : "},
       {"unbalanced", "", {.lignes = {{"706000", "100"}}, .ttc = "100.01"},
        "La pièce n'est pas équilibrée : débit 100.01, crédit 100.00."},
+      {"analytic rows short of their movement", "",
+       {.lignes = {{.numcp = "706000", .ht = "100", .ventilation = {{"ATELIER", "0", "60"}, {"CHANTIER", "0", "39.99"}}}}},
+       "Mouvement 1 : la ventilation analytique (débit 0.00, crédit 99.99) ne totalise pas le mouvement (débit 0.00, "
+       "crédit 100.00)."},
   };
   int n = 0;
   for (const Case& c : cases) {

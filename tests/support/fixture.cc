@@ -33,6 +33,10 @@ std::vector<std::string> incoherences(host::Database& db) {
       {"pièce déséquilibrée",
        "SELECT NPIES FROM MOUVE GROUP BY NPIES HAVING abs(sum(CAST(MTDEB AS REAL)) - sum(CAST(MTCRE AS REAL))) > "
        "0.0001"},
+      {"ventilation analytique différente de son mouvement",
+       "SELECT m.UNIQ FROM MOUVE m JOIN (SELECT MOUVE_UNIQ, sum(CAST(MTADE AS REAL)) d, sum(CAST(MTACR AS REAL)) c "
+       "FROM VTSEC GROUP BY MOUVE_UNIQ) v ON v.MOUVE_UNIQ = m.UNIQ WHERE abs(v.d - CAST(m.MTDEBS AS REAL)) > 0.0001 "
+       "OR abs(v.c - CAST(m.MTCRES AS REAL)) > 0.0001"},
       {"mouvement sans pièce", "SELECT UNIQ FROM MOUVE m WHERE NOT EXISTS (SELECT 1 FROM PIECE p WHERE p.NPIES = m.NPIES)"},
       {"instance d'import ouverte", "SELECT NINST FROM IMPORT_INSTANCE WHERE ETAT = 'O'"},
       {"ligne de transfert laissée",
