@@ -285,7 +285,8 @@ std::unique_ptr<Database> Database::ouvrir(const std::string& path) {
   if (version != kSchemaVersion)
     throw HostError("le dossier « " + path + " » est de la version " + (version.empty() ? "?" : version) +
                     " du schéma ; ce programme lit la version " + kSchemaVersion);
-  if (sqlite3_exec(db, "PRAGMA journal_mode = WAL", nullptr, nullptr, nullptr) != SQLITE_OK)
+  if (sqlite3_exec(db, "PRAGMA journal_mode = WAL; PRAGMA synchronous = NORMAL", nullptr, nullptr, nullptr) !=
+      SQLITE_OK)
     unusable(path, db, sqlite3_extended_errcode(db));
   return result;
 }
@@ -321,8 +322,11 @@ Statement& Database::prepare(const std::string& sql) {
   return wrappers_.emplace(sql, Statement(db_, stmt)).first->second;
 }
 
-void Database::begin(Verrou verrou) {
-  if (depth_ == 0) run(verrou == Verrou::immediat ? "BEGIN IMMEDIATE" : "BEGIN DEFERRED");
+void Database::begin(Verrou verrou, Sync sync) {
+  if (depth_ == 0) {
+    run(verrou == Verrou::immediat ? "BEGIN IMMEDIATE" : "BEGIN DEFERRED");
+    forced_ = sync == Sync::forced;
+  }
   ++depth_;
 }
 
@@ -332,7 +336,23 @@ int Database::changements() const { return sqlite3_changes(db_); }
 
 void Database::commit() {
   if (depth_ == 0) return;
-  if (--depth_ == 0) run("COMMIT");
+  if (--depth_ > 0) return;
+  bool wrote = ecritureEnCours();
+  run("COMMIT");
+  if (forced_ && wrote) syncLog();
+}
+
+// Puts the write-ahead log on the disk: every unit committed so far survives a power
+// cut. The commit itself is done; a disk that refuses is reported, so that nobody is
+// told an operation is kept when it may not be.
+void Database::syncLog() {
+  sqlite3_file* log = nullptr;
+  if (sqlite3_file_control(db_, "main", SQLITE_FCNTL_JOURNAL_POINTER, &log) != SQLITE_OK || !log || !log->pMethods)
+    return;
+  if (int rc = log->pMethods->xSync(log, SQLITE_SYNC_NORMAL); rc != SQLITE_OK)
+    throw NonGarde("le disque n'a pas confirmé l'écriture du dossier (" + std::string(sqlite3_errstr(rc)) +
+                    ") : ce qui vient d'être enregistré peut ne pas survivre à une coupure de courant");
+  ++forced_writes_;
 }
 
 void Database::run(const std::string& sql) {

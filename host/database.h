@@ -15,6 +15,7 @@
 #include <string_view>
 #include <vector>
 
+#include "host/error.h"
 #include "host/value.h"
 
 struct sqlite3;
@@ -85,9 +86,29 @@ class Database {
   Statement& prepare(const std::string& sql);
 
   // Units of work nest; only the outermost commits or rolls back.
+  //
+  // Durability. The dossier is kept in write-ahead-log mode with synchronous NORMAL:
+  // a commit is atomic, survives the death of the process at once, and survives a
+  // power cut once the log has reached the disk. A unit begun `Sync::forced` (the
+  // default) forces the log to the disk before its commit returns; a user action
+  // begins `Sync::whenAsked` and is forced only if what it wrote includes something
+  // the user will be told is kept (`forcer()`: an operation saved or deleted, a piece
+  // written to the ledger). The log is written in order, so forcing it keeps every
+  // unit committed before: a power cut can lose the last numbers drawn and work rows
+  // kept since the last forced unit, never a saved operation.
   enum class Verrou { immediat, differe };
-  void begin(Verrou verrou = Verrou::immediat);
+  enum class Sync { forced, whenAsked };
+  // Thrown by `commit()` when the unit is committed but the disk refused to keep the
+  // log: the work is done and must not be undone on screen, only reported.
+  struct NonGarde : HostError {
+    using HostError::HostError;
+  };
+  void begin(Verrou verrou = Verrou::immediat, Sync sync = Sync::forced);
   void commit();
+  // The unit in progress must reach the disk before its commit returns.
+  void forcer() { forced_ = true; }
+  // Forced writes of the log so far, for the tests and the benchmarks.
+  long long ecrituresForcees() const { return forced_writes_; }
   void rollback();
   int profondeur() const { return depth_; }
   // True while the unit holds the dossier's write lock (it wrote to the dossier).
@@ -121,10 +142,13 @@ class Database {
   // Runs a statement without result through the cache: a unit begins and ends at
   // every user action, and preparing those each time was a measurable part of one.
   void run(const std::string& sql);
+  void syncLog();
 
   sqlite3* db_;
   std::string path_;
   int depth_ = 0;
+  bool forced_ = true;
+  long long forced_writes_ = 0;
   std::map<std::string, std::unique_ptr<sqlite3_stmt, void (*)(sqlite3_stmt*)>> statements_;
   std::map<std::string, Statement> wrappers_;
   std::map<std::string, std::vector<Colonne>> columns_;

@@ -206,7 +206,7 @@ bool Session::action(const std::function<void()>& act) {
     bool again = false;
     ++action_depth_;
     try {
-      db_->begin(lock);
+      db_->begin(lock, Database::Sync::whenAsked);
       act();
       executerFile();
       // Work a library began in the action and left unfinished ends with it.
@@ -221,6 +221,9 @@ bool Session::action(const std::function<void()>& act) {
     if (!again && !failed_) {
       try {
         db_->commit();
+        break;
+      } catch (const Database::NonGarde& e) {
+        signalerErreur("", e.what());
         break;
       } catch (const std::exception& e) {
         signalerErreur("", e.what());

@@ -178,7 +178,10 @@ void Saisie::validation(Evt*) {
   }
   header.ecrit();
   saveLines(ident);
-  if (!stopped(*this)) saved_ = true;
+  if (stopped(*this)) return;
+  saved_ = true;
+  // The user is about to be told the document is saved.
+  session().base().forcer();
 }
 
 void Saisie::suppression(Evt* e) {
@@ -197,6 +200,7 @@ void Saisie::suppression(Evt* e) {
   deleteLines(identifiantDocument());
   if (stopped(*this)) return;
   table(false)->supprime();
+  session().base().forcer();
   clearLines();
   // The document is gone: nothing is left to show.
   sortir(e, 0);

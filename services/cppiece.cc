@@ -388,6 +388,7 @@ int PieceImport::finPiece(const std::string& flag) {
   try {
     value(piece, host::euro().tenue());
     write(piece);
+    db().forcer();
   } catch (const host::HostError& error) {
     return fail(kPieceRefused, "La pièce n'a pu être écrite : " + std::string(error.what()));
   }

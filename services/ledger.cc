@@ -76,6 +76,7 @@ void ajouterProceduresPieces(host::Automate& library) {
     execute(db, std::string("DELETE FROM \"ECHEA\" WHERE \"UNIQ\" IN (") + kMovementsOfPiece + ")", npies);
     execute(db, "DELETE FROM \"MOUVE\" WHERE \"NLIGS\" >= ?1 AND \"NLIGS\" < ?1 || '~'", npies);
     execute(db, "DELETE FROM \"PIECE\" WHERE \"NPIES\" = ?", npies);
+    db.forcer();
     self->erreurMethode(0, e);
   });
 

@@ -2,13 +2,16 @@
 // `mirvae run` on a fresh demo dossier, the demo, and --help on every command.
 #include <gtest/gtest.h>
 #include <sqlite3.h>
+#include <signal.h>
 #include <sys/wait.h>
+#include <unistd.h>
 
 #include <cstdio>
 #include <filesystem>
 #include <fstream>
 #include <sstream>
 
+#include "host/database.h"
 #include "host/text.h"
 #include "tests/support/fixture.h"
 
@@ -169,6 +172,58 @@ TEST_F(MirvaeRunTest, AnInitKilledHalfWayLeavesNothingInTheWayOfTheNext) {
   auto folder = std::filesystem::path(other_).parent_path();
   for (const auto& entry : std::filesystem::directory_iterator(folder))
     if (entry.path().string().rfind(other_ + ".", 0) == 0) std::filesystem::remove(entry.path());
+}
+
+// The program killed at any moment of a session that saves invoices one after the
+// other: every invoice whose save the user saw confirmed is in the books with its
+// piece, and nothing is half-written.
+TEST_F(MirvaeRunTest, AKilledSessionKeepsEverySaveItConfirmedAndNothingHalfWritten) {
+  std::string text = "open MIRVAE-ACCES1\n";
+  const int invoices = 4;
+  for (int i = 1; i <= invoices; ++i)
+    text += "press CREER\ntype VLIBCP1 \"Brasserie Lissandre\"\nline new\ntype LST_MIRVAL.NUMCP 706300\n"
+            "type LST_V_HT " + std::to_string(100 * i) + "\nline validate\nline new\ntype LST_MIRVAL.NUMCP 708500\n"
+            "type LST_V_HT 10\nline validate\nanswer dialog 1\npress B_VALID_DOC\nexpect no error\nsay SAVED\nclose\n";
+  std::ofstream(script_) << text;
+  for (int killAfter : {3, 11, 16, 24, 33, 47}) {
+    SCOPED_TRACE(killAfter);
+    std::filesystem::remove(dossier_);
+    for (const char* suffix : {"-wal", "-shm"}) std::filesystem::remove(dossier_ + suffix);
+    ASSERT_EQ(mirvae("init --demo " + quote(dossier_)).status, 0);
+    int out[2];
+    ASSERT_EQ(::pipe(out), 0);
+    pid_t child = ::fork();
+    if (child == 0) {
+      ::dup2(out[1], 1);
+      ::close(out[0]);
+      ::execl(MIRVAE_BINARY, MIRVAE_BINARY, "run", dossier_.c_str(), script_.c_str(), static_cast<char*>(nullptr));
+      ::_exit(127);
+    }
+    ::close(out[1]);
+    // Reads the transcript line by line and kills the program right after line
+    // `killAfter` arrived.
+    int lines = 0, confirmed = 0;
+    std::string pending;
+    char c;
+    while (lines < killAfter && ::read(out[0], &c, 1) == 1) {
+      if (c != '\n') {
+        pending += c;
+        continue;
+      }
+      ++lines;
+      if (pending == "SAVED") ++confirmed;
+      pending.clear();
+    }
+    ::kill(child, SIGKILL);
+    ::waitpid(child, nullptr, 0);
+    ::close(out[0]);
+    auto db = host::Database::ouvrir(dossier_);
+    EXPECT_TRUE(testing_support::incoherences(*db).empty());
+    host::Statement& saved = db->prepare("SELECT count(*) FROM MIRVAE WHERE NPIES <> ''");
+    ASSERT_TRUE(saved.step());
+    EXPECT_GE(saved.integer(0), confirmed);
+    saved.reset();
+  }
 }
 
 TEST_F(MirvaeRunTest, ListingAndExportWriteTheLedgerAsStoredOrNameTheValueTheyCannotRead) {

@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <utility>
 
 #include "tests/entry/gestion1_fixture.h"
 
@@ -375,6 +376,40 @@ TEST_F(KindsTest, AReceiptAndAPaymentPostTheirLinesAgainstTheAccount) {
     model::fermer(session());
   }
   EXPECT_TRUE(testing_support::incoherences(base()).empty());
+}
+
+// The disk is forced once for each operation saved and posted, and once for each
+// removed: never for what only draws a number or keeps a line being typed.
+TEST_F(KindsTest, OnlyTheSaveAndTheRemovalOfAnOperationForceTheDisk) {
+  const struct {
+    int kind;
+    const char *header, *account;
+  } cases[] = {
+      {1, "Brasserie Lissandre", "706300"}, {2, "Scierie Maurel Frères", "601000"},
+      {3, "Bonnefon Lucas", "625100"},      {4, "", "411001"},
+      {5, "", "411001"},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.kind);
+    kind_ = c.kind;
+    long long forced = base().ecrituresForcees();
+    auto newlyForced = [&] { return base().ecrituresForcees() - std::exchange(forced, base().ecrituresForcees()); };
+    ASSERT_TRUE(creer());
+    if (*c.header) {
+      ASSERT_TRUE(saisir("VLIBCP1", c.header));
+    }
+    ASSERT_TRUE(ligne(c.account, "100"));
+    ASSERT_TRUE(ligne(c.account, "20"));
+    EXPECT_EQ(newlyForced(), 0);
+    ASSERT_TRUE(enregistrer("1"));
+    EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE WHERE NPIES <> ''"), 1);
+    EXPECT_EQ(newlyForced(), 1);
+    model::fermer(session());
+    ASSERT_TRUE(ouvrirFiche(sql("SELECT IDENT FROM MIRVAE"), "VMCAv"));
+    ASSERT_TRUE(appuyer("SUPPRESSION")) << session().transcript().rendu();
+    EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE") + nombre("SELECT count(*) FROM PIECE"), 0);
+    EXPECT_EQ(newlyForced(), 1);
+  }
 }
 
 TEST_F(KindsTest, ALineAccountClosedOrGoneBeforeSavingStopsTheSave) {
