@@ -84,12 +84,16 @@ class ValidatingUser : public host::UserAgent {
     throw host::HostError("question inattendue pendant la mesure : « " + question + " »");
   }
   std::string dialogue(const std::string&, const std::string&, const std::vector<std::string>&) override {
-    return "1";
+    return saveChoice;
   }
   std::optional<std::string> choisir(const std::string& window, const std::vector<std::string>&) override {
     throw host::HostError("fenêtre de choix inattendue pendant la mesure : « " + window + " »");
   }
   void piloter(host::Session&, host::Automate&) override {}
+
+  // The save dialog's answer: "1" saves, "2" saves and starts the next operation on
+  // the same screen.
+  std::string saveChoice = "1";
 };
 
 // A fresh demo dossier, removed with the object, and a session on it.
@@ -113,6 +117,7 @@ class Dossier {
   }
   void close() { session_.reset(); }
   host::Session& session() { return *session_; }
+  ValidatingUser& user() { return user_; }
 
  private:
   std::string path_;

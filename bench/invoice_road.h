@@ -43,13 +43,16 @@ inline constexpr const char* kTotalTva = "72.57";
 inline constexpr const char* kTotalTtc = "435.42";
 
 // Types one invoice into a new entry screen and saves it; the screen is closed
-// afterwards. Throws HostError naming the step that was refused, with what the user
-// saw: a benchmark must never count an invoice that was not saved.
-inline void typeInvoice(host::Session& session) {
+// afterwards, unless `onOpenScreen`: then the invoice is typed on the entry screen in
+// front, opened if there is none, and left open (the save answered "2" starts the
+// next one there). Throws HostError naming the step that was refused, with what the
+// user saw: a benchmark must never count an invoice that was not saved.
+inline void typeInvoice(host::Session& session, bool onOpenScreen = false) {
   auto must = [&](bool accepted, const char* step) {
     if (!accepted) throw host::HostError(std::string("saisie refusée : ") + step + "\n" + session.transcript().rendu());
   };
-  must(model::ouvrir(session, "MIRVAE-GESTION1"), "ouverture de MIRVAE-GESTION1");
+  if (!onOpenScreen || !session.ecran("MIRVAE-GESTION1"))
+    must(model::ouvrir(session, "MIRVAE-GESTION1"), "ouverture de MIRVAE-GESTION1");
   must(model::saisir(session, "VLIBCP1", kClientLabel), "client");
   must(model::saisir(session, "MIRVAE.DTOPE", kDay), "date");
   for (const InvoiceLine& line : kLines) {
@@ -59,7 +62,7 @@ inline void typeInvoice(host::Session& session) {
     must(model::validerLigne(session), "validation de la ligne");
   }
   must(model::appuyer(session, "B_VALID_DOC"), "enregistrement");
-  model::fermer(session);
+  if (!onOpenScreen) model::fermer(session);
   // What the user saw is kept by the session; the benchmark does not read it.
 }
 

@@ -40,6 +40,14 @@ class Ecran {
   std::string commandeLibelle(int n) const;
   std::string titreDe(const std::string& object) const;
   const std::vector<std::string>& affichages() const { return redisplayed_; }
+  // What the front end has not drawn yet: the objects redisplayed and the list
+  // functions applied, in order. Taking it empties both, so that a screen kept open
+  // over a long session holds only what came since it was last drawn.
+  struct Dessin {
+    std::vector<std::string> affichages;
+    std::vector<std::pair<int, std::string>> fonctions;
+  };
+  Dessin prendreDessin() { return {std::exchange(redisplayed_, {}), std::exchange(functions_, {})}; }
   // Whether `name` was redisplayed since the last call for it; the call forgets it,
   // so the model shows a list again once however many times it was asked.
   bool takeRedisplay(const std::string& name) { return pending_.erase(name) != 0; }

@@ -29,6 +29,7 @@
 #include <vector>
 
 #include "host/database.h"
+#include "host/screen.h"
 #include "host/registry.h"
 
 namespace host {
@@ -104,6 +105,9 @@ class UserAgent {
   // modal screens since it began will be asked for again).
   virtual void actionCommencee() {}
   virtual void actionRecommencee() {}
+  // After each user action, what an open screen has to show again (Ecran::Dessin):
+  // a front end draws it; the others let it go.
+  virtual void dessiner(Automate& screen, Ecran::Dessin dessin) { (void)screen, (void)dessin; }
 };
 
 // Answers given in advance, in order. A question with no answer left is an
@@ -123,6 +127,9 @@ class ReponsesPreparees : public UserAgent {
   void piloter(Session& session, Automate& screen) override;
   void actionCommencee() override { played_.clear(); }
   void actionRecommencee() override;
+  // Keeps the last drawing handed over, for a test to look at.
+  void dessiner(Automate&, Ecran::Dessin dessin) override { dernierDessin = std::move(dessin); }
+  Ecran::Dessin dernierDessin;
 
  private:
   using Steps = std::function<void(Session&, Automate&)>;

@@ -141,6 +141,8 @@ bool act(Session& session, const std::string& kind, const std::string& text, con
   });
   if (ok && !accepted)
     session.transcript().ajouter("refus", focus.empty() || focus == object ? text : text + " (" + focus + ")");
+  // The front end draws what the action changed; the screens keep nothing of it.
+  for (Automate* open : session.ecrans()) session.agent().dessiner(*open, open->ecran()->prendreDessin());
   return ok && accepted;
 }
 

@@ -379,9 +379,11 @@ TEST_F(DocumentCycleTest, AHandlerPutsTheCurrentLineIntoModification) {
   EXPECT_FALSE(document().lineInEntry());
   ASSERT_TRUE(model::appuyer(session(), "SOLDER"));
   EXPECT_TRUE(document().lineInEntry());
+  // The front end is asked to show the line's new values; the screen keeps nothing.
+  EXPECT_EQ(user_.dernierDessin.fonctions.back(), std::make_pair(20, std::string("LST")));
+  EXPECT_TRUE(model::ecranDevant(session()).ecran()->fonctions().empty());
   ASSERT_TRUE(model::validerLigne(session()));
   EXPECT_EQ(model::lignes(session()).at(1).at("HT"), "99.00");
-  EXPECT_EQ(model::ecranDevant(session()).ecran()->fonctions().back(), std::make_pair(20, std::string("LST")));
   ASSERT_TRUE(model::appuyer(session(), "VALID_DOC"));
   EXPECT_EQ(lignesDe("D1"), "D1|000001 706100 10.00, D1|000002 706200 99.00");
 }
