@@ -295,6 +295,13 @@ int Table::suivant(int mode, char) {
   return found ? 0 : 100;
 }
 
+void Table::replacer(const Position& p) {
+  open();
+  buffer_ = p.buffer;
+  rowid_ = p.rowid;
+  as_read_ = p.asRead;
+}
+
 long long Table::nombre() {
   open();
   Statement& s = db_->prepare("SELECT count(*) FROM " + sqlName() + where(false));

@@ -81,6 +81,15 @@ class Table {
   int lit(int mode, Champ& field, char op, const char* value);
   // mode 3: first row of the request; mode 1: the row after the current one.
   int suivant(int mode, char unused = 'A');
+  // Where the cursor stands in its request: the current row as read. Put back, the
+  // next suivant(1) goes on after that row, even if the row is gone meanwhile.
+  struct Position {
+    std::vector<Valeur> buffer;
+    std::optional<long long> rowid;
+    long long asRead = 0;
+  };
+  Position position() const { return {buffer_, rowid_, as_read_}; }
+  void replacer(const Position& p);
 
   // ---- writing
   void raz(char mode = 0);  // blank record; the next ecrit() inserts

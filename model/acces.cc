@@ -53,14 +53,15 @@ void Scritere::fill() {
   host::Table& main = *table(false);
   out_of_date_ = false;
   // A new list: the one it replaces may still be kept for a failed action to put back.
-  shown_ = std::make_shared<std::vector<Shown>>();
+  pages_.clear();
+  count_ = 0;
+  complete_ = false;
+  resume_.reset();
   selected_ = 0;
   alias_ = main.alias();
   columns_ = main.colonnes();
-  // The variables are the screen's own: no handler's local lives between rows.
-  const std::vector<host::Donnee*> shownVariables = variables();
   variables_.clear();
-  for (const host::Donnee* d : shownVariables) variables_.push_back(d->nom());
+  for (const host::Donnee* d : variables()) variables_.push_back(d->nom());
   int keys = 0;
   for (std::size_t i = 0; i < columns_.size(); ++i)
     if (columns_[i].key) {
@@ -69,44 +70,98 @@ void Scritere::fill() {
     }
   if (keys != 1) keyColumn_ = -1;
 
+  if (!readPage()) return;
   const std::string list = kList;
+  if (step(*this, list + (count_ == 0 ? "_LISTE_VIDE" : "_LISTE_PLEINE")) == Outcome::stopped) return;
+  if (count_ > 0) selectRow(1);
+}
+
+bool Scritere::readPage() {
+  host::Table& main = *table(false);
+  // The variables are the screen's own: no handler's local lives between rows.
+  const std::vector<host::Donnee*> shownVariables = variables();
+  const std::string selection = std::string(kList) + "_SELECTION";
+  // Without a one-field key the request cannot be taken up again: it is read whole.
+  const bool resumable = keyColumn_ >= 0;
   AmountDecimals decimals;
-  for (int rc = main.suivant(3); rc == 0; rc = main.suivant(1)) {
-    Outcome outcome = step(*this, list + "_SELECTION");
-    if (outcome == Outcome::stopped) return;
-    if (outcome == Outcome::refused) continue;
-    Shown row;
-    for (std::size_t i = 0; i < columns_.size(); ++i) {
-      host::Valeur v = main.valeur(columns_[i].name);
-      row.values += shownText(v, *this, decimals);
-      row.values += '\0';
-      if (static_cast<int>(i) == keyColumn_) row.key = std::move(v);
-    }
-    for (const host::Donnee* d : shownVariables) {
-      row.values += shownText(d->valeur(), *this, decimals);
-      row.values += '\0';
-    }
-    row.values.shrink_to_fit();
-    shown_->push_back(std::move(row));
+  auto page = std::make_shared<Page>();
+  auto keep = [&] {
+    if (page->empty()) return;
+    page->shrink_to_fit();
+    count_ += page->size();
+    pages_.push_back(std::move(page));
+    page = std::make_shared<Page>();
+  };
+  int rc;
+  if (resume_) {
+    main.replacer(*resume_);
+    rc = main.suivant(1);
+  } else {
+    rc = main.suivant(3);
   }
-  shown_->shrink_to_fit();
-  if (step(*this, list + (shown_->empty() ? "_LISTE_VIDE" : "_LISTE_PLEINE")) == Outcome::stopped) return;
-  if (!shown_->empty()) selectRow(1);
+  for (; rc == 0; rc = main.suivant(1)) {
+    host::Table::Position here = main.position();
+    Outcome outcome = step(*this, selection);
+    if (outcome == Outcome::stopped) return false;
+    if (outcome == Outcome::accepted) {
+      Shown row;
+      for (std::size_t i = 0; i < columns_.size(); ++i) {
+        host::Valeur v = main.valeur(columns_[i].name);
+        row.values += shownText(v, *this, decimals);
+        row.values += '\0';
+        if (static_cast<int>(i) == keyColumn_) row.key = std::move(v);
+      }
+      for (const host::Donnee* d : shownVariables) {
+        row.values += shownText(d->valeur(), *this, decimals);
+        row.values += '\0';
+      }
+      row.values.shrink_to_fit();
+      page->push_back(std::move(row));
+    }
+    if (page->size() == kPage) {
+      keep();
+      if (resumable) {
+        resume_ = std::move(here);
+        return true;
+      }
+    }
+  }
+  keep();
+  complete_ = true;
+  resume_.reset();
+  return true;
+}
+
+bool Scritere::readUntil(std::size_t n) {
+  bool read = false;
+  while (count_ < n && !complete_) {
+    if (!readPage()) return false;
+    read = true;
+  }
+  // Reading moved the main table's buffer: it goes back on the selected row.
+  if (read && selected_ > 0) selectRow(selected_);
+  return count_ >= n;
 }
 
 void Scritere::keepState(host::Snapshot& snapshot) {
   Traitecr::keepState(snapshot);
-  snapshot.keep(out_of_date_, alias_, columns_, variables_, keyColumn_, shown_, selected_);
+  snapshot.keep(out_of_date_, alias_, columns_, variables_, keyColumn_, pages_, count_, complete_, resume_,
+                selected_);
+}
+
+const Scritere::Shown& Scritere::shown(int n) const {
+  checkRow(n);
+  auto at = static_cast<std::size_t>(n - 1);
+  return (*pages_[at / kPage])[at % kPage];
 }
 
 void Scritere::checkRow(int n) const {
-  if (n < 1 || n > static_cast<int>(shown_->size()))
+  if (n < 1 || static_cast<std::size_t>(n) > count_)
     throw host::HostError("la liste « " + std::string(kList) + " » n'a pas de ligne " + std::to_string(n));
 }
 
 RowText Scritere::row(int n) const {
-  checkRow(n);
-  const std::string& packed = (*shown_)[n - 1].values;
+  const std::string& packed = shown(n).values;
   RowText text;
   std::size_t at = 0;
   auto next = [&] {
@@ -127,17 +182,17 @@ RowText Scritere::row(int n) const {
 
 std::vector<RowText> Scritere::rows() const {
   std::vector<RowText> out;
-  out.reserve(shown_->size());
-  for (std::size_t n = 1; n <= shown_->size(); ++n) out.push_back(row(static_cast<int>(n)));
+  out.reserve(count_);
+  for (std::size_t n = 1; n <= count_; ++n) out.push_back(row(static_cast<int>(n)));
   return out;
 }
 
 void Scritere::selectRow(int n) {
-  checkRow(n);
+  const Shown& chosen = shown(n);
   host::Table& main = *table(false);
   if (keyColumn_ >= 0) {
     host::Champ key(columns_[keyColumn_].name.c_str(), &main);
-    if (main.lit(3, key, '=', (*shown_)[n - 1].key) != 0)
+    if (main.lit(3, key, '=', chosen.key) != 0)
       throw host::HostError("la ligne " + std::to_string(n) + " de la liste n'existe plus dans « " + main.alias() + " »");
   } else {
     // Without a one-field key the row cannot be read again: its values are put back.

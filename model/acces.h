@@ -14,6 +14,11 @@
 // the main table's fields and of the screen variables as the handler left them.
 // Then "LST_LISTE_VIDE" or "LST_LISTE_PLEINE" runs, and the first row is selected.
 //
+// The list is read a page at a time, in index order: filling it reads the first page
+// only, whatever the size of the request, and the rows after it are read when the
+// user moves to them (readUntil, inside a user action), going on in the index from
+// the last row read. A main table without a one-field key cannot be read again on
+// a row, and its list is read whole.
 // Selecting a row (selectRow) puts the main table's buffer on that row, so that
 // the actions ("GERER", "CREER", ... branches run by name) act on it. When the
 // screen comes back in front of the user (another screen closed), "DEBUT_ACTIVATION"
@@ -22,10 +27,12 @@
 
 #include <map>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "host/database.h"
+#include "host/table.h"
 #include "host/value.h"
 #include "model/row_text.h"
 #include "model/traitecr.h"
@@ -45,9 +52,15 @@ class Scritere : public Traitecr {
   void refreshList();
   bool listOutOfDate() const { return out_of_date_; }
 
-  // Rows shown, in list order; row(n) from 1. The text is made when asked for: a
-  // list keeps each row's values packed, so that a long list stays small.
-  std::size_t rowCount() const { return shown_->size(); }
+  // Rows read so far, in list order; row(n) from 1. The text is made when asked
+  // for: a list keeps each row's values packed, so that a long list stays small.
+  std::size_t rowCount() const { return count_; }
+  // Whether every row of the request has been read.
+  bool complete() const { return complete_; }
+  // Reads on until row n is read or the request ends; true when row n exists. Runs
+  // "LST_SELECTION": only inside a user action.
+  bool readUntil(std::size_t n);
+  void readAll() { readUntil(static_cast<std::size_t>(-1)); }
   RowText row(int n) const;
   std::vector<RowText> rows() const;
   // Selects row n (from 1): the main table's buffer is read again on that row.
@@ -72,7 +85,15 @@ class Scritere : public Traitecr {
     std::string values;
     host::Valeur key;
   };
+  // Rows in pages of kPage; every page but the last is full. A page is never
+  // changed once read, so a failed action's snapshot shares them.
+  static constexpr std::size_t kPage = 100;
+  using Page = std::vector<Shown>;
+
   void fill();
+  // Reads the next page of the request; false when a handler stopped the action.
+  bool readPage();
+  const Shown& shown(int n) const;
   void checkRow(int n) const;
 
   bool out_of_date_ = true;
@@ -80,7 +101,11 @@ class Scritere : public Traitecr {
   std::vector<host::Colonne> columns_;   // of the main table, at the last fill
   std::vector<std::string> variables_;   // names of the screen's variables, at the last fill
   int keyColumn_ = -1;                   // the one-field key among columns_, or -1
-  std::shared_ptr<std::vector<Shown>> shown_ = std::make_shared<std::vector<Shown>>();
+  std::vector<std::shared_ptr<const Page>> pages_;
+  std::size_t count_ = 0;
+  bool complete_ = true;
+  // Where the request stands after the last row read, when the list goes on.
+  std::optional<host::Table::Position> resume_;
   int selected_ = 0;
 };
 

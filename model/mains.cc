@@ -262,22 +262,31 @@ bool allerLigne(Session& session, int n) {
              [n](Automate& a) { return static_cast<Sdocum&>(a).goToLine(n); });
 }
 
+// Reads an access list on to its end, as a user scrolling down to its last row.
+Scritere& readToTheEnd(Session& session, Scritere& list) {
+  if (!list.complete()) session.action([&] { list.readAll(); });
+  return list;
+}
+
 std::vector<RowText> lignes(Session& session) {
   Automate& screen = ecranDevant(session);
-  if (auto* list = dynamic_cast<Scritere*>(&screen)) return list->rows();
+  if (auto* list = dynamic_cast<Scritere*>(&screen)) return readToTheEnd(session, *list).rows();
   if (auto* document = dynamic_cast<Sdocum*>(&screen)) return document->rows();
   throw HostError("l'écran « " + screen.code() + " » n'a pas de liste");
 }
 
 std::size_t nombreLignes(Session& session) {
   Automate& screen = ecranDevant(session);
-  if (auto* list = dynamic_cast<Scritere*>(&screen)) return list->rowCount();
+  if (auto* list = dynamic_cast<Scritere*>(&screen)) return readToTheEnd(session, *list).rowCount();
   return lignes(session).size();
 }
 
 bool choisirLigne(Session& session, int n) {
   auto* list = dynamic_cast<Scritere*>(&ecranDevant(session));
   if (!list) throw HostError("l'écran « " + ecranDevant(session).code() + " » n'a pas de liste d'accès");
+  // The user scrolls down to the row first.
+  if (n > static_cast<int>(list->rowCount()) && !list->complete())
+    session.action([&] { list->readUntil(static_cast<std::size_t>(n)); });
   if (n < 1 || n > static_cast<int>(list->rowCount()))
     throw HostError("la liste n'a pas de ligne " + std::to_string(n));
   return act(session, "action", "choisir la ligne " + std::to_string(n), "", [n](Automate& a) {

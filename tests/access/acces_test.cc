@@ -177,6 +177,36 @@ INSTANTIATE_TEST_SUITE_P(Kinds, BrowserKindTest, ::testing::ValuesIn(kSortes),
 
 // ---------------------------------------------------------------------------- what all kinds share, on kind 1
 
+// A long list is read a page at a time in index order: opening reads the first page
+// only; moving down reads on from the last row read, rows refused by the posting
+// state included, and a row changed meanwhile by another user is shown as it is now.
+TEST_F(BrowserTest, ALongListIsReadAsTheUserMovesDownInIndexOrder) {
+  base().exec("DELETE FROM MIRVAE");
+  base().exec(
+      "WITH RECURSIVE n(i) AS (SELECT 1 UNION ALL SELECT i + 1 FROM n WHERE i < 350) "
+      "INSERT INTO MIRVAE (IDENT, TYPE, DTOPE, NUMCP, NPIES) SELECT printf('%08d', i), 'FC', "
+      "date('2024-01-01', '+' || (i % 60) || ' days'), '411001', CASE WHEN i % 3 = 0 THEN 'P1' ELSE '' END FROM n");
+  base().exec("INSERT OR REPLACE INTO PIECE (NPIES, IMPUT) VALUES ('P1', 'O')");
+  const std::string inIndexOrder = "SELECT group_concat(IDENT, ' ') FROM (SELECT IDENT FROM MIRVAE WHERE NPIES = '' "
+                                   "ORDER BY DTOPE, IDENT)";
+  ouvrirEcran(1);
+  mains::saisir(session(), "VMOIAN", "");
+  ASSERT_TRUE(mains::saisir(session(), "VIMPUT", "N"));
+  auto& list = dynamic_cast<model::Scritere&>(mains::ecranDevant(session()));
+  EXPECT_EQ(list.rowCount(), 100u);
+  EXPECT_FALSE(list.complete());
+  // Another user posts a row of the second page meanwhile: it is no longer shown.
+  std::string posted = sql("SELECT IDENT FROM MIRVAE WHERE NPIES = '' ORDER BY DTOPE, IDENT LIMIT 1 OFFSET 150");
+  base().exec("UPDATE MIRVAE SET NPIES = 'P1' WHERE IDENT = '" + posted + "'");
+  ASSERT_TRUE(mains::choisirLigne(session(), 180));
+  EXPECT_EQ(list.rowCount(), 200u);
+  EXPECT_EQ(v("MIRVAE.IDENT"), list.row(180).at("IDENT"));
+  std::string shown;
+  for (const std::string& id : idents()) shown += (shown.empty() ? "" : " ") + id;
+  EXPECT_EQ(shown, sql(inIndexOrder));
+  EXPECT_TRUE(list.complete());
+}
+
 TEST_F(BrowserTest, PeriodComboHasTheMonthsThenNoPeriodAndTheTwoExercises) {
   base().exec("UPDATE PARAM SET PDTCL = '2025-02-28'");
   ouvrirEcran();
