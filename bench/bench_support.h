@@ -96,6 +96,38 @@ class ValidatingUser : public host::UserAgent {
   std::string saveChoice = "1";
 };
 
+// `count` operations, the six kinds in turn, `kPerMonth` of each kind a month going
+// back from March 2024; nine client invoices in ten posted (a PIECE row, half of
+// them final), the clients of the demo dossier in turn, bank and cash operations on
+// the accounts their browsers open on.
+inline void fillWithOperations(host::Database& db, long long count, long long kPerMonth) {
+  db.begin();
+  host::Statement& operations = db.prepare(R"(
+    WITH RECURSIVE n(i) AS (SELECT 0 UNION ALL SELECT i + 1 FROM n WHERE i + 1 < ?1)
+    INSERT INTO MIRVAE (IDENT, TYPE, DTOPE, NUMCP, NUMJL, NPIEC, INPIE, NPIES, MONNAIE_IDENT, COURS,
+                        DTECH, SAISIE_MTT, HT, TVA, TTC, DATEC, USERM)
+    SELECT printf('%08d', i + 1), kind,
+           date('2024-03-01', printf('-%d months', (i / 6) / ?2), printf('+%d days', (i / 6) % 28)),
+           CASE kind WHEN 'FC' THEN printf('41100%d', 1 + (i / 6) % 6) WHEN 'BQ' THEN '512100'
+                     WHEN 'CA' THEN '530000' ELSE '401001' END,
+           CASE kind WHEN 'FC' THEN 'VT' ELSE 'OD' END,
+           printf('VT%06d', i / 6), printf('Facture client n° VT%06d', i / 6),
+           CASE WHEN kind = 'FC' AND (i / 6) % 10 <> 9 THEN printf('%011d', i + 1) ELSE '' END,
+           'EUR', 1, '2024-04-30', '1', '300', '60', '360', '2024-03-15', 'banc'
+    FROM (SELECT i, CASE i % 6 WHEN 0 THEN 'FC' WHEN 1 THEN 'FF' WHEN 2 THEN 'NDF' WHEN 3 THEN 'BQ'
+                                 WHEN 4 THEN 'CA' ELSE 'OD' END AS kind FROM n)
+  )");
+  operations.bind(1, count).bind(2, kPerMonth);
+  operations.step();
+  operations.reset();
+  db.exec(R"(
+    INSERT INTO PIECE (NPIES, NPIEC, NUMJL, DTOPE, IMPUT)
+    SELECT NPIES, NPIEC, NUMJL, DTOPE, CASE WHEN CAST(IDENT AS INTEGER) % 12 = 1 THEN 'O' ELSE '' END
+    FROM MIRVAE WHERE NPIES <> ''
+  )");
+  db.commit();
+}
+
 // A fresh demo dossier, removed with the object, and a session on it.
 class Dossier {
  public:

@@ -17,10 +17,12 @@
 //   MIRVAE_BENCH_REPETITIONS (5)
 #include <sqlite3.h>
 
+#include <algorithm>
 #include <iostream>
 #include <set>
 
 #include "bench/bench_support.h"
+#include "model/acces.h"
 #include "model/mains.h"
 
 namespace {
@@ -35,36 +37,6 @@ const long long kRepetitions = bench::size("MIRVAE_BENCH_REPETITIONS", 5);
 // dossier's exercise.
 const char kMonth[] = "03/2024";
 
-// `count` operations, the six kinds in turn, `kPerMonth` of each kind a month going
-// back from March 2024; nine client invoices in ten posted (a PIECE row, half of
-// them final), the clients of the demo dossier in turn.
-void generate(host::Database& db, long long count) {
-  db.begin();
-  host::Statement& operations = db.prepare(R"(
-    WITH RECURSIVE n(i) AS (SELECT 0 UNION ALL SELECT i + 1 FROM n WHERE i + 1 < ?1)
-    INSERT INTO MIRVAE (IDENT, TYPE, DTOPE, NUMCP, NUMJL, NPIEC, INPIE, NPIES, MONNAIE_IDENT, COURS,
-                        DTECH, SAISIE_MTT, HT, TVA, TTC, DATEC, USERM)
-    SELECT printf('%08d', i + 1), kind,
-           date('2024-03-01', printf('-%d months', (i / 6) / ?2), printf('+%d days', (i / 6) % 28)),
-           CASE kind WHEN 'FC' THEN printf('41100%d', 1 + (i / 6) % 6) ELSE '401001' END,
-           CASE kind WHEN 'FC' THEN 'VT' ELSE 'OD' END,
-           printf('VT%06d', i / 6), printf('Facture client n° VT%06d', i / 6),
-           CASE WHEN kind = 'FC' AND (i / 6) % 10 <> 9 THEN printf('%011d', i + 1) ELSE '' END,
-           'EUR', 1, '2024-04-30', '1', '300', '60', '360', '2024-03-15', 'banc'
-    FROM (SELECT i, CASE i % 6 WHEN 0 THEN 'FC' WHEN 1 THEN 'FF' WHEN 2 THEN 'NDF' WHEN 3 THEN 'BQ'
-                                 WHEN 4 THEN 'CA' ELSE 'OD' END AS kind FROM n)
-  )");
-  operations.bind(1, count).bind(2, kPerMonth);
-  operations.step();
-  operations.reset();
-  db.exec(R"(
-    INSERT INTO PIECE (NPIES, NPIEC, NUMJL, DTOPE, IMPUT)
-    SELECT NPIES, NPIEC, NUMJL, DTOPE, CASE WHEN CAST(IDENT AS INTEGER) % 12 = 1 THEN 'O' ELSE '' END
-    FROM MIRVAE WHERE NPIES <> ''
-  )");
-  db.commit();
-}
-
 // A dossier of `count` operations, made once per process and kept until its end.
 const std::string& dossierOf(long long count) {
   static std::map<long long, std::unique_ptr<bench::Dossier>> dossiers;
@@ -72,7 +44,7 @@ const std::string& dossierOf(long long count) {
   if (!slot) {
     auto start = std::chrono::steady_clock::now();
     slot = std::make_unique<bench::Dossier>("mirvae-list");
-    generate(slot->open().base(), count);
+    bench::fillWithOperations(slot->open().base(), count, kPerMonth);
     slot->close();
     std::chrono::duration<double> took = std::chrono::steady_clock::now() - start;
     std::cout << "dossier of " << count << " operations made in " << took.count() << " s\n" << std::flush;
@@ -173,17 +145,22 @@ int main(int argc, char** argv) {
   bench::prepareProcess();
   dossierOf(kSmall);
   dossierOf(kLarge);
-  // The browser opens on no period: it lists every client invoice of the dossier.
-  // That is how the screen starts, not what the target is about, so it is only shown.
-  auto opening = [](long long count) {
+  // Every browser opens on no period: its first rows must be there at once, however
+  // many operations the dossier holds (target: 50 ms on the large one).
+  double slowestOpening = 0;
+  for (int kind = 1; kind <= 6; ++kind) {
+    bench::ValidatingUser user;
+    host::Session session(registry::ouvrirDossier(dossierOf(kLarge)), user, "banc");
+    const std::string screen = "MIRVAE-ACCES" + std::to_string(kind);
     auto start = std::chrono::steady_clock::now();
-    OpenBrowser& browser = browserOn(count);
-    std::chrono::duration<double> took = std::chrono::steady_clock::now() - start;
-    std::cout << "browser opened on no period in " << took.count() << " s, listing "
-              << model::nombreLignes(browser.session) << " client invoices; peak memory so far "
-              << bench::peakMemoryKb() / 1024 << " MB\n";
-    return browser.listMonth();
-  };
+    if (!model::ouvrir(session, screen)) throw host::HostError(screen + " ne s'ouvre pas");
+    std::chrono::duration<double, std::milli> took = std::chrono::steady_clock::now() - start;
+    slowestOpening = std::max(slowestOpening, took.count());
+    std::cout << screen << " opened on no period over " << kLarge << " operations in " << took.count()
+              << " ms, first rows: " << dynamic_cast<model::Scritere&>(model::ecranDevant(session)).rowCount()
+              << "\n";
+  }
+  auto opening = [](long long count) { return browserOn(count).listMonth(); };
   std::size_t smallRows = opening(kSmall), largeRows = opening(kLarge);
   std::cout << "client invoices of " << kMonth << ": " << smallRows << " (small dossier), " << largeRows
             << " (large dossier)\n";
@@ -205,6 +182,8 @@ int main(int argc, char** argv) {
               small_ms, kSmall, smallRows, large_ms, kLarge, largeRows, figures.spread(smallName) * 100,
               figures.spread(largeName) * 100);
   double ratio = large_ms / small_ms;
+  std::printf("first rows of the slowest browser opened on no period: %.1f ms (target <= 50: %s)\n", slowestOpening,
+              slowestOpening <= 50 ? "met" : "MISSED");
   std::printf("ratio large/small: %.2f (target <= 1.5: %s%s)\n", ratio, ratio <= 1.5 ? "met" : "MISSED",
               indexed ? "" : ", a request scans MIRVAE");
   return 0;
