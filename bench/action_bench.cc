@@ -4,13 +4,14 @@
 // on one of 1,000,000. The figures are each action's p50 and p99; the targets are a
 // p99 ratio large/small of at most 1.2 for every action, and no action above 20 ms at
 // p99 on the large dossier. Saving waits for the disk (one forced write an operation
-// saved) and removing too: their times are reported apart from the 20 ms rule.
+// saved) and removing too: their times are reported (marked *), not held to the
+// targets.
 //
 // The dossiers are filled with raw SQL (bench_support.h); each road then runs on them
 // through the screens, as a user types.
 //
 //   MIRVAE_BENCH_ACTION_SMALL (10000)  MIRVAE_BENCH_ACTION_LARGE (1000000)
-//   MIRVAE_BENCH_ACTION_ROADS (40 roads of each kind and size)
+//   MIRVAE_BENCH_ACTION_ROADS (200 roads of each kind and size)
 #include <algorithm>
 #include <chrono>
 #include <cstdio>
@@ -26,10 +27,11 @@ namespace {
 
 const long long kSmall = bench::size("MIRVAE_BENCH_ACTION_SMALL", 10000);
 const long long kLarge = bench::size("MIRVAE_BENCH_ACTION_LARGE", 1000000);
-const long long kRoads = bench::size("MIRVAE_BENCH_ACTION_ROADS", 40);
+const long long kRoads = bench::size("MIRVAE_BENCH_ACTION_ROADS", 200);
 
 // What a user types for one operation of a kind: the header's account (by its label,
-// none for bank, cash and miscellaneous), then each line's account, side and amount.
+// none for bank, cash and miscellaneous) or the direction, then each line's account,
+// side and amount.
 struct Line {
   const char *account, *side, *amount;
 };
@@ -37,13 +39,14 @@ struct Road {
   int kind;
   const char* header;
   std::vector<Line> lines;
+  const char* direction = "";  // bank and cash: "D" a payment
 };
 const Road kRoadsByKind[] = {
     {1, "Brasserie Lissandre", {{"706300", "", "1500"}, {"708500", "", "80"}}},
     {2, "Scierie Maurel Frères", {{"601000", "", "2400"}, {"624100", "", "150"}}},
     {3, "Bonnefon Lucas", {{"625100", "", "85"}, {"625700", "", "40"}}},
     {4, "", {{"411001", "", "1464"}, {"411002", "", "20"}}},
-    {5, "", {{"606400", "", "42.80"}, {"626000", "", "8"}}},
+    {5, "", {{"401002", "", "42.80"}, {"401001", "", "8"}}, "D"},
     {6, "", {{"530000", "D", "200"}, {"512200", "C", "200"}}},
 };
 
@@ -75,6 +78,7 @@ void play(host::Session& session, const Road& road, Times& times) {
   const std::string screen = "MIRVAE-GESTION" + std::to_string(road.kind);
   timed("open", [&] { return model::ouvrir(session, screen); });
   if (*road.header) timed("type header", [&] { return model::saisir(session, "VLIBCP1", road.header); });
+  if (*road.direction) timed("type direction", [&] { return model::saisir(session, "MIRVAE.TYPE_DR", road.direction); });
   for (const Line& line : road.lines) {
     timed("new line", [&] { return model::nouvelleLigne(session); });
     timed("type account", [&] { return model::saisir(session, "LST_MIRVAL.NUMCP", line.account); });
@@ -131,14 +135,16 @@ int main() {
       double p50l = percentile(times, 0.5), p99l = percentile(times, 0.99);
       double ratio = p99s > 0 ? p99l / p99s : 0;
       std::printf("%-4d %-16s %9.2f %9.2f %9.2f %9.2f %7.2f\n", kind, action.c_str(), p50s, p99s, p50l, p99l, ratio);
+      // The actions that wait for the disk (marked *) are reported, not held to the
+      // targets: their time is the disk's.
+      if (action.back() == '*') continue;
       std::string at = std::to_string(kind) + " " + action;
       if (ratio > worstRatio) worstRatio = ratio, worstRatioAt = at;
-      // The actions that wait for the disk (marked *) are reported, not held to 20 ms.
-      if (action.back() != '*' && p99l > worstP99) worstP99 = p99l, worstP99At = at;
+      if (p99l > worstP99) worstP99 = p99l, worstP99At = at;
     }
   std::printf("slowest action at p99 on %lld operations (forced writes apart): %.2f ms, %s (target <= 20: %s)\n",
               kLarge, worstP99, worstP99At.c_str(), worstP99 <= 20 ? "met" : "MISSED");
-  std::printf("worst p99 ratio large/small: %.2f, %s (target <= 1.2: %s)\n", worstRatio, worstRatioAt.c_str(),
+  std::printf("worst p99 ratio large/small (forced writes apart): %.2f, %s (target <= 1.2: %s)\n", worstRatio, worstRatioAt.c_str(),
               worstRatio <= 1.2 ? "met" : "MISSED");
   return 0;
 }
