@@ -202,6 +202,7 @@ void MIRVAECreer_piece_bq::justification_echeance(host::Evt*) {
     stop("L'échéance n° " + nusys + " serait soldée en euros sans l'être dans sa monnaie : justifiez la ligne à nouveau.");
 
   const std::string group = settlementGroup();
+  const long long settled = ECHEA_NUSYS.entier();
   ECHEA_UNIQR = MOUVE_UNIQ;
   ECHEA_MTPAY = settledKeeping;
   ECHEA_MTPAYS = DBL_MT_ECHEANCE_EN_MONNAIE_FACTURE.decimal();
@@ -239,14 +240,14 @@ void MIRVAECreer_piece_bq::justification_echeance(host::Evt*) {
   const host::Decimal difference = settledKeeping - DBL_MT_REGT_EN_MONNAIE_TENUE.decimal();
   const bool invoiceDebit = !(MOUVE1_MTDEB == 0);
   const host::Decimal exchangePart = difference.isZero() ? host::Decimal() : exchange;
-  addDifference(PARAM_PJOCHAN.chaine().c_str(), kExchangeLabel, exchangePart, invoiceDebit);
-  addDifference(PARAM_PJOEURO.chaine().c_str(), kRoundingLabel, difference - exchangePart, invoiceDebit);
+  addDifference(PARAM_PJOCHAN.chaine().c_str(), kExchangeLabel, exchangePart, invoiceDebit, settled);
+  addDifference(PARAM_PJOEURO.chaine().c_str(), kRoundingLabel, difference - exchangePart, invoiceDebit, settled);
 }
 
 // A positive difference is still due on the invoice: the tiers account takes it on
 // the side that settles; a negative one was settled beyond it and goes back.
 void MIRVAECreer_piece_bq::addDifference(const char* journal, const char* label, const host::Decimal& amount,
-                                         bool invoiceDebit) {
+                                         bool invoiceDebit, long long nusys) {
   if (amount.isZero()) return;
   const bool tiersDebit = (amount.sign() > 0) != invoiceDebit;
   EAEUR.raz();
@@ -257,7 +258,7 @@ void MIRVAECreer_piece_bq::addDifference(const char* journal, const char* label,
   EAEUR_LIBECR = std::string(label) + PIECE1_NPIEC.chaine();
   EAEUR_MONTANT = amount.abs();
   EAEUR_SENS = tiersDebit ? "D" : "C";
-  EAEUR_NUMENG = ECHEA_NUSYS;
+  EAEUR_NUMENG = host::Valeur::entier(nusys);
   EAEUR.ecrit();
 }
 

@@ -139,7 +139,10 @@ class MIRVAECreer_piece_bq : public posting::PostingProcess {
   void renameGroup(const std::string& from, const std::string& to);
   // Letters the group for good when every due date of its invoices is settled.
   void closeGroupIfSettled(const std::string& group);
-  void addDifference(const char* journal, const char* label, const host::Decimal& amount, bool tiersDebit);
+  // A difference of the settled due date `nusys`: positive when the invoice still had
+  // that much open after the settlement.
+  void addDifference(const char* journal, const char* label, const host::Decimal& amount, bool invoiceDebit,
+                     long long nusys);
   // Stops the posting with `text`: nothing of the operation is saved.
   [[noreturn]] void stop(const std::string& text);
 

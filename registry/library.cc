@@ -103,9 +103,9 @@ void declarerUnites() {
   static const Module gestAna("", "MIRVAE-GEST_ANA", &host::fabriquer<analytic::MIRVAEGest_ana>, false, "");
   static const Source gestAnaSource("MIRVAE", nullptr);
 
-  // Unit GEST_JUS.
-  static const Global gestJusGlobal("MIRVAE", "MIRVAE");
-  static const Module gestJus("", "MIRVAE-GEST_JUS", &host::fabriquer<justification::MIRVAEGest_jus>, false, "");
+  // Unit GEST_JUS: it declares no globals of its own.
+  static const Module gestJus("Justification Règlement", "MIRVAE-GEST_JUS",
+                              &host::fabriquer<justification::MIRVAEGest_jus>, false, "");
   static const Source gestJusSource("MIRVAE", nullptr);
 
   // Unit INTERFACE: it also works with the globals of the general-ledger library.

@@ -138,9 +138,15 @@ TEST_F(MirvaeRunTest, TheDemoMakesItsDossierAndNeverReplacesAnotherFile) {
     // The last line is the grand total: nothing, when debits and credits match.
     std::string total = balance.out.substr(balance.out.find_last_of('-') + 1);
     EXPECT_EQ(total.find_first_not_of(" \n0"), std::string::npos) << balance.out;
-    // The bank account holds what its browser showed after the receipt: 1464.00, "D".
+    // The bank account holds the client's receipt, 1464.00, and the dollar receipt
+    // valued at its own day's rate, 952.38.
     Outcome bank = run("hledger -f " + quote(journal) + " balance 512100 --no-total");
-    EXPECT_NE(bank.out.find("1464.00 EUR  512100"), std::string::npos) << bank.out;
+    EXPECT_NE(bank.out.find("2416.38 EUR  512100"), std::string::npos) << bank.out;
+    // Every settled client is left with nothing open in euros, exchange difference booked.
+    for (const char* client : {"411001", "411006"}) {
+      Outcome settled = run("hledger -f " + quote(journal) + " balance " + client + " --no-total");
+      EXPECT_EQ(settled.out.find(client), std::string::npos) << settled.out;
+    }
   }
   std::filesystem::remove(journal);
 
