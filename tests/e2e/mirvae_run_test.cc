@@ -122,6 +122,11 @@ TEST_F(MirvaeRunTest, TheDemoMakesItsDossierAndNeverReplacesAnotherFile) {
   EXPECT_NE(demo.out.find("[ouvre] MIRVAE-GESTION1"), std::string::npos) << demo.out;
   EXPECT_NE(demo.out.find("Le dossier de démonstration est "), std::string::npos) << demo.out;
   EXPECT_TRUE(std::filesystem::exists(other_));
+  // The ledger tells each due date's state: the client's invoice and credit note
+  // settled by the bank receipt, the supplier's invoice still open.
+  Outcome listed = mirvae("ledger " + quote(other_));
+  EXPECT_NE(listed.out.find(": 1794.00, réglée (1794.00) par la pièce "), std::string::npos) << listed.out;
+  EXPECT_NE(listed.out.find(": 3060.00, ouverte"), std::string::npos) << listed.out;
   // Played again, it starts from a fresh dossier: same result.
   Outcome again = mirvae("demo --dossier " + quote(other_));
   EXPECT_EQ(again.status, 0) << again.out;
