@@ -206,15 +206,7 @@ void MIRVAEGest_jus::recomputeRemainder() {
   ecran()->affiche("V_RESTE_A_JUSTIF", "V_TOTAL_REGT", "PIED_1", "PIED_2", "");
 }
 
-void MIRVAEGest_jus::rewriteRow(const char* step) {
-  try {
-    MIRVAJUS_M02.ecrit();
-  } catch (const host::HostError&) {
-    tableError(step, 1);
-  }
-}
-
-void MIRVAEGest_jus::insertRow(const char* step) {
+void MIRVAEGest_jus::writeRow(const char* step) {
   try {
     MIRVAJUS_M02.ecrit();
   } catch (const host::HostError&) {
@@ -332,7 +324,7 @@ void MIRVAEGest_jus::lecture_echeances_reglees(Evt*) {
       M02_MTREGS = -regs;
     }
     exchangeDifference();
-    insertRow("8");
+    writeRow("8");
   }
   MIRVAJUS_M01.initRequete();
 }
@@ -394,7 +386,7 @@ void MIRVAEGest_jus::lecture_echeances_a_regler(Evt* e) {
       M02_NPIEC = PIECE_NPIEC;
       loadFigures();
       appelerProcedure("", "", "", "ANALYSE_SITUATION_JUSTIFICATION", nullptr, 0);
-      insertRow("13");
+      writeRow("13");
     }
     ECHEA.initRequete();
   }
@@ -586,7 +578,7 @@ void MIRVAEGest_jus::lst_mirvajus_m02_mtreg(Evt* e) {
     M02_MTREG = -reg;
   }
   exchangeDifference();
-  rewriteRow("15");
+  writeRow("15");
   ecran()->affiche("LST", "PIED_2", "");
   appelerProcedure("", "", "", "CALCUL_TOTAL_REGLE", nullptr, 0);
   recomputeRemainder();

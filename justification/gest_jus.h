@@ -178,9 +178,9 @@ class MIRVAEGest_jus : public model::Traitecr, public model::FreeList {
   void recomputeRemainder();
   // The exchange difference of the row in the list buffer.
   void exchangeDifference();
-  void rewriteRow(const char* step);
-  // Keeps the due date in the list buffer as a new row.
-  void insertRow(const char* step);
+  // Writes the row in the list buffer (a new one when it was blanked); `step` names a
+  // failure.
+  void writeRow(const char* step);
   // The due date's amount as the screen shows it: negative when its piece nets
   // against the settlement.
   host::Decimal shownDueAmount(host::Champ& amount);
