@@ -477,6 +477,29 @@ TEST_F(ReglementTest, PartialPaymentsAtManyRatesLeaveNoResidualCent) {
   }
 }
 
+// One payment that closes an invoice and the rest of another, partly paid before,
+// joins both settlements into one lettering, which balances to the cent.
+TEST_F(ReglementTest, APaymentOfTwoInvoicesLettersThemTogether) {
+  std::string a = facturer({"FA", "FC", "411001", "100", "USD", "1.1"});
+  std::string b = facturer({"FB", "FC", "411001", "200", "USD", "1.2"});
+  regler("R1", "R", "411001", a, "50", "USD", "1.3", "1.1");
+  std::string rest = sql("SELECT NUSYS FROM ECHEA WHERE NPIES = '" + npies("FA") + "' AND UNIQR = 0");
+  ecrire({.ident = "R2", .type = "BQ", .lignes = {{"411001", "250"}}, .numcp = "512100", .numjl = "BQ1",
+          .monnaie = "USD", .cours = "0.9", .typeDr = "R"});
+  // Settled at 0.9: 200 USD are 222.22 EUR against 166.67, 50 USD 55.56 against 45.45.
+  sql("INSERT INTO MIRVAJUS (IDENTR, NUSYS, MTREG, MTREGS, MTECHG) VALUES ('R2-1', " + b +
+      ", '222.22', '200', '-55.55'), ('R2-1', " + rest + ", '55.56', '50', '-10.11')");
+  poster("R2", "BQ");
+  ASSERT_FALSE(npies("R2").empty()) << testing::PrintToString(session().transcript().textes("erreur"));
+  EXPECT_EQ(solde("411001"), "0.00");
+  EXPECT_EQ(sql("SELECT count(DISTINCT RELET) || ' ' || min(RELET = upper(RELET) AND RELET <> '') FROM MOUVE "
+                "WHERE NUMCP = '411001'"),
+            "1 1");
+  EXPECT_EQ(sql("SELECT count(DISTINCT RELET) FROM ECHEA WHERE NPIES IN ('" + npies("FA") + "', '" + npies("FB") +
+                "')"),
+            "1");
+}
+
 // What cannot be settled stops the posting whole: no piece, no settlement, no
 // difference, and the reason said.
 TEST_F(ReglementTest, ASettlementThatCannotBeMadePostsNothing) {
