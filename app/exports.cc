@@ -137,11 +137,25 @@ void imprimerGrandLivre(host::Database& db, std::ostream& out) {
       a.reset();
     }
     m.reset();
-    Statement& e = db.prepare("SELECT NUSYS, DTECH, MTECH FROM ECHEA WHERE NPIES = ? ORDER BY NUSYS");
+    // Each due date with its state: open, paid in part (the rest is the next due date
+    // of the same movement) or settled, with the piece that paid it and its lettering.
+    Statement& e = db.prepare(
+        "SELECT NUSYS, DTECH, MTECH, UNIQR, MTPAY, MTRES, RELET, "
+        "coalesce((SELECT NPIES FROM MOUVE WHERE MOUVE.UNIQ = ECHEA.UNIQR), '') FROM ECHEA WHERE NPIES = ? "
+        "ORDER BY NUSYS");
     e.bind(1, p.npies);
     while (e.step()) {
       StoredRow row("ECHEA", e);
-      listing << "    échéance du " << row.day(1) << " : " << host::amountText(row.amount(2), decimals) << "\n";
+      listing << "    échéance du " << row.day(1) << " : " << host::amountText(row.amount(2), decimals);
+      if (e.integer(3) == 0)
+        listing << ", ouverte";
+      else if (row.amount(5).isZero())
+        listing << ", réglée (" << host::amountText(row.amount(4), decimals) << ") par la pièce " << row.text(7)
+                << ", lettrage " << row.text(6);
+      else
+        listing << ", payée en partie (" << host::amountText(row.amount(4), decimals) << ") par la pièce "
+                << row.text(7) << ", reste " << host::amountText(row.amount(5), decimals);
+      listing << "\n";
     }
     e.reset();
   }

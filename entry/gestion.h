@@ -110,6 +110,9 @@ class Part {
   virtual void saved() {}
   // The lines were totalled again: `ttc` is what they come to, taxes included.
   virtual void linesTotalled(const Decimal& /*ttc*/) {}
+  // The document moved to another currency: `convert` re-prices an amount of the old
+  // one; `line` is each line's IDENT in turn, then "" once for the document's own.
+  virtual void amountsConverted(const std::string& /*line*/, const std::function<Decimal(const Decimal&)>& /*convert*/) {}
   // The data steps of one line, after its analytic rows: read from the dossier into
   // the work tables, saved into the dossier, deleted from it.
   virtual void lineExtracted() {}

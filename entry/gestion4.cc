@@ -1,6 +1,5 @@
 #include "entry/gestion4.h"
 
-#include "host/registry.h"
 
 namespace entry {
 
@@ -82,8 +81,6 @@ void TreasuryEntry::appel_justification(Evt* e) {
   else
     V_MTCRE = amount;
 
-  // Until the justification screen is part of the library, there is nothing to open.
-  if (!Registre::instance().module(std::string("MIRVAE-") + kJustificationScreen)) return;
   if (enVisualisation()) procedure("EXTRACTION_TABLE_MIRVAJUS");
   lireJournal();
   EvtParamRef justification(10, &MIRVAL_IDENT, &JONAL_TYPJL, &V_TYPCPT, &MIRVAL_NUMCP, &V_MTDEB, &V_MTCRE,

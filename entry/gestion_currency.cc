@@ -180,8 +180,10 @@ void EntryScreen::convertAmounts(const std::function<Decimal(const Decimal&)>& c
     if (ident.empty()) continue;
     model::convertChildRows(MIRVAANA_M01, MIRVAANA_M01_NUMERO, ident, {&MIRVAANA_M01_MTADE, &MIRVAANA_M01_MTACR},
                             convert);
+    for (Part* part : parts_) part->amountsConverted(ident, convert);
   }
   MEM_MIRVAL.initRequete();
+  for (Part* part : parts_) part->amountsConverted("", convert);
 }
 
 void EntryScreen::actualiser_info_monetaires(Evt*) {

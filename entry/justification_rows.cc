@@ -28,6 +28,12 @@ void JustificationRows::discardWorkingRows() {
   model::removeChildRows(MIRVAJUS_M01, byLine(MIRVAJUS_M01_IDENTR), s_.MIRVAL_IDENT.chaine());
 }
 
+void JustificationRows::amountsConverted(const std::string& line,
+                                         const std::function<Decimal(const Decimal&)>& convert) {
+  if (line.empty()) return;
+  model::convertChildRows(MIRVAJUS_M01, byLine(MIRVAJUS_M01_IDENTR), line, {&MIRVAJUS_M01_MTREGS}, convert);
+}
+
 void JustificationRows::extraction_table_mirvajus(Evt*) {
   discardWorkingRows();
   model::copyChildRows(MIRVAJUS, byLine(MIRVAJUS_IDENTR), MIRVAJUS_M01, s_.MIRVAL_IDENT.chaine());

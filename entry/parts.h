@@ -203,6 +203,8 @@ class TreasuryAccount : public HeaderAccount {
   bool lineAccountAccepted(Evt* e, const std::string& account) override;
   void lineAccountRead() override;
   void linesTotalled(const Decimal& ttc) override;
+  // The opening balance is shown in the document's currency.
+  void amountsConverted(const std::string& line, const std::function<Decimal(const Decimal&)>& convert) override;
 
   void vlibcp1(Evt* e) override;
   void type_dr(Evt* e);
@@ -252,6 +254,9 @@ class JustificationRows : public Part {
   void lineExtracted() override;
   void lineSaved() override;
   void lineDeleted() override;
+  // What a line settles is typed in the document's currency (MTREGS); the keeping
+  // currency's amounts stay as they are.
+  void amountsConverted(const std::string& line, const std::function<Decimal(const Decimal&)>& convert) override;
 
   void extraction_table_mirvajus(Evt* e);
   void suppression_table_mirvajus(Evt* e);
@@ -263,6 +268,7 @@ class JustificationRows : public Part {
   Table MIRVAJUS_M01{&s_, "", "MIRVAJUS_M01", ""};
   Champ MIRVAJUS_IDENTR{"IDENTR", &MIRVAJUS};
   Champ MIRVAJUS_M01_IDENTR{"IDENTR", &MIRVAJUS_M01};
+  Champ MIRVAJUS_M01_MTREGS{"MTREGS", &MIRVAJUS_M01};
 };
 
 }  // namespace entry

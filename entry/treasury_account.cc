@@ -149,4 +149,9 @@ void TreasuryAccount::afficher_solde(Evt*) {
   s_.ecran()->affiche("V_TSOLDE", "");
 }
 
+void TreasuryAccount::amountsConverted(const std::string& line,
+                                       const std::function<Decimal(const Decimal&)>& convert) {
+  if (line.empty()) V_SOLDE_INITIAL = convert(V_SOLDE_INITIAL.decimal());
+}
+
 }  // namespace entry

@@ -13,6 +13,7 @@
 #include "model/sdocum.h"
 #include "model/shown.h"
 #include "model/step.h"
+#include "model/traitecr.h"
 
 namespace model {
 
@@ -55,13 +56,20 @@ host::Valeur typedValue(Automate& screen, const Target& target, const std::strin
   return host::Valeur::montant(host::euro().saisi(text, screenCurrency(screen), object));
 }
 
+// The prefix of the list columns of the screen ("LST_"), "" when it has no list.
+std::string listPrefix(Automate& screen) {
+  std::string name;
+  if (auto* document = dynamic_cast<Sdocum*>(&screen)) name = document->listName();
+  if (auto* list = dynamic_cast<FreeList*>(&screen)) name = list->listName();
+  return name.empty() ? "" : name + "_";
+}
+
 // Every name under which the screen may forbid or hide `object`: a field with and
 // without its table ("MIRVAE.NUMJL", and "NUMJL" for the main table), each with and
 // without the list's prefix ("LST_MIRVAL.COTVA", "MIRVAL.COTVA"; "LST_V_HT", "V_HT").
 std::vector<std::string> namesOf(Automate& screen, const std::string& object) {
   std::string name = object;
-  auto* document = dynamic_cast<Sdocum*>(&screen);
-  std::string list = document && !document->listName().empty() ? document->listName() + "_" : "";
+  std::string list = listPrefix(screen);
   if (!list.empty() && name.rfind(list, 0) == 0) name = name.substr(list.size());
   std::vector<std::string> bare{name};
   if (std::size_t dot = name.find('.'); dot != std::string::npos) {
@@ -88,10 +96,9 @@ bool outOfReach(Automate& screen, const std::string& object) {
 Target resolve(Automate& screen, const std::string& object) {
   Target t;
   std::string name = object;
-  auto* document = dynamic_cast<Sdocum*>(&screen);
-  if (document && !document->listName().empty() && object.rfind(document->listName() + "_", 0) == 0) {
+  if (std::string list = listPrefix(screen); !list.empty() && object.rfind(list, 0) == 0) {
     t.listColumn = true;
-    name = object.substr(document->listName().size() + 1);
+    name = object.substr(list.size());
   }
   if (std::size_t dot = name.find('.'); dot != std::string::npos) {
     std::string alias = name.substr(0, dot);
@@ -204,7 +211,7 @@ bool saisir(Session& session, const std::string& object, const std::string& text
     if (outOfReach(a, object)) return false;
     if (saisie && saisie->modeCourant() != "C" && saisie->modeCourant() != "M") return false;
     if (target.listColumn) {
-      if (!document || !document->beginLineChange()) return false;
+      if (document ? !document->beginLineChange() : !dynamic_cast<FreeList*>(&a)) return false;
     } else if (document) {
       document->leaveList();
     }
@@ -255,6 +262,12 @@ bool supprimerLigne(Session& session) { return lineAction(session, "supprimer la
 bool abandonnerLigne(Session& session) { return lineAction(session, "abandonner la ligne", &Sdocum::abandonLine); }
 
 bool allerLigne(Session& session, int n) {
+  if (auto* list = dynamic_cast<FreeList*>(&ecranDevant(session))) {
+    if (n < 1 || n > static_cast<int>(list->rows().size()))
+      throw HostError("la liste « " + list->listName() + " » n'a pas de ligne " + std::to_string(n));
+    return act(session, "action", "ligne " + std::to_string(n), "",
+               [list, n](Automate&) { return list->goToRow(n); });
+  }
   Sdocum& document = documentInFront(session);
   if (n < 1 || n > static_cast<int>(document.rows().size()))
     throw HostError("la liste « " + document.listName() + " » n'a pas de ligne " + std::to_string(n));
@@ -272,6 +285,7 @@ std::vector<RowText> lignes(Session& session) {
   Automate& screen = ecranDevant(session);
   if (auto* list = dynamic_cast<Scritere*>(&screen)) return readToTheEnd(session, *list).rows();
   if (auto* document = dynamic_cast<Sdocum*>(&screen)) return document->rows();
+  if (auto* list = dynamic_cast<FreeList*>(&screen)) return list->rows();
   throw HostError("l'écran « " + screen.code() + " » n'a pas de liste");
 }
 

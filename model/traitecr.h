@@ -12,7 +12,9 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
+#include "model/row_text.h"
 #include "model/traitmnt.h"
 
 namespace model {
@@ -35,6 +37,21 @@ class Traitecr : public Traitbas {
 
  private:
   std::string screen_name_;
+};
+
+// A free screen that shows one list of rows (the justification's due dates). Its
+// columns are reached as "<list>_<TABLE>.<FIELD>" ("LST_MIRVAJUS_M02.MTREGS"): the
+// value typed goes into the record of the current row, and the branch of that full
+// name runs; the screen writes the row back.
+class FreeList {
+ public:
+  virtual ~FreeList() = default;
+  // The list's name ("LST").
+  virtual std::string listName() const = 0;
+  // The rows, in list order.
+  virtual std::vector<RowText> rows() = 0;
+  // Makes row n (from 1) current; false when the screen refuses.
+  virtual bool goToRow(int n) = 0;
 };
 
 }  // namespace model

@@ -400,6 +400,7 @@ CREATE TABLE "ECHEA" (
   "MTPAYS"         MONEY TEXT NOT NULL DEFAULT '0', -- paid, piece currency
   "MTRES"          MONEY TEXT NOT NULL DEFAULT '0', -- still due, keeping currency
   "MTRESS"         MONEY TEXT NOT NULL DEFAULT '0', -- still due, piece currency
+  "RELET"          TEXT       NOT NULL DEFAULT '',  -- lettering group of its settlement, '' while open
   "SIECH"          TEXT       NOT NULL DEFAULT '',
   "NUREL"          TEXT       NOT NULL DEFAULT '',
   "DERNL"          TEXT       NOT NULL DEFAULT '',

@@ -8,6 +8,7 @@
 #include "entry/gestion4.h"
 #include "entry/gestion6.h"
 #include "host/registry.h"
+#include "justification/gest_jus.h"
 #include "host/value.h"
 #include "posting/creer_piece_bq.h"
 #include "posting/creer_piece_fc.h"
@@ -101,6 +102,11 @@ void declarerUnites() {
   static const Global gestAnaGlobal("MIRVAE", "MIRVAE");
   static const Module gestAna("", "MIRVAE-GEST_ANA", &host::fabriquer<analytic::MIRVAEGest_ana>, false, "");
   static const Source gestAnaSource("MIRVAE", nullptr);
+
+  // Unit GEST_JUS: it declares no globals of its own.
+  static const Module gestJus("Justification Règlement", "MIRVAE-GEST_JUS",
+                              &host::fabriquer<justification::MIRVAEGest_jus>, false, "");
+  static const Source gestJusSource("MIRVAE", nullptr);
 
   // Unit INTERFACE: it also works with the globals of the general-ledger library.
   static const Global interfaceComptaGlobal("COMPTA", "MIRVAE");

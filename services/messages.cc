@@ -41,6 +41,17 @@ void Cpmessag::mess_ok3(Evt* e) {
   session().montrer(text);
 }
 
+MirvaeBiblioproc::MirvaeBiblioproc(Evt* e) : Automate(e) {
+  nomBase("MIRVAE");
+  addBranch("ERREUR_TABLE", &MirvaeBiblioproc::erreur_table);
+}
+
+void MirvaeBiblioproc::erreur_table(Evt* e) {
+  exigerParametres(e, 3);
+  session().montrer("Erreur d'accès à une table (écran " + e->parametre(0).chaine() + ", étape " +
+                    e->parametre(1).chaine() + ", code " + e->parametre(2).chaine() + ").");
+}
+
 bool questionOuiNon(Automate& self, Evt* e) {
   exigerParametres(e, 1);
   bool yes = self.session().demander(e->parametre(0).chaine());

@@ -26,6 +26,17 @@ class Cpmessag : public host::Automate {
   void mess_ok3(host::Evt* e);
 };
 
+// "MIRVAE"/"MOD_CAL_BIBLIOPROC": the module's own library procedures.
+//
+//   "ERREUR_TABLE" (automaton code, step, table error code)   shows the user which
+//                                      step of which screen could not read or write a row.
+class MirvaeBiblioproc : public host::Automate {
+ public:
+  explicit MirvaeBiblioproc(host::Evt* e);
+
+  void erreur_table(host::Evt* e);
+};
+
 // The yes/no question of "MESS_ON", shared with the accounting library's own:
 // asks parameter 0 and sets the method result of `self` (1 yes, 0 no).
 // Returns the answer.

@@ -24,6 +24,7 @@ void chargerServices() {
   loaded = true;
   Module("", "CPMESSAG-INTERFACE", &fabriquer<Cpmessag>, false, "");
   Module("", "COMPTA-MOD_CAL_BIBLIOPROC", &fabriquer<Compta>, false, "");
+  Module("", "MIRVAE-MOD_CAL_BIBLIOPROC", &fabriquer<MirvaeBiblioproc>, false, "");
   Module("", "COMPTA-VISUECRI", &fabriquer<Visuecri>, false, "");
   Module("", "COMPTA-LANCE_REOUVERTURE_ANNU", &fabriquer<Lance_reouverture_annu>, false, "");
   Module("", "COMPTA-CHOIX_MODELE_ECRITURES", &fabriquer<Choix_modele_ecritures>, false, "");

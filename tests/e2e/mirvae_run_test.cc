@@ -125,6 +125,11 @@ TEST_F(MirvaeRunTest, TheDemoMakesItsDossierAndNeverReplacesAnotherFile) {
   EXPECT_NE(demo.out.find("[ouvre] MIRVAE-GESTION1"), std::string::npos) << demo.out;
   EXPECT_NE(demo.out.find("Le dossier de démonstration est "), std::string::npos) << demo.out;
   EXPECT_TRUE(std::filesystem::exists(other_));
+  // The ledger tells each due date's state: the client's invoice and credit note
+  // settled by the bank receipt, the supplier's invoice still open.
+  Outcome listed = mirvae("ledger " + quote(other_));
+  EXPECT_NE(listed.out.find(": 1794.00, réglée (1794.00) par la pièce "), std::string::npos) << listed.out;
+  EXPECT_NE(listed.out.find(": 3060.00, ouverte"), std::string::npos) << listed.out;
   // Played again, it starts from a fresh dossier: same result.
   Outcome again = mirvae("demo --dossier " + quote(other_));
   EXPECT_EQ(again.status, 0) << again.out;
@@ -141,9 +146,15 @@ TEST_F(MirvaeRunTest, TheDemoMakesItsDossierAndNeverReplacesAnotherFile) {
     // The last line is the grand total: nothing, when debits and credits match.
     std::string total = balance.out.substr(balance.out.find_last_of('-') + 1);
     EXPECT_EQ(total.find_first_not_of(" \n0"), std::string::npos) << balance.out;
-    // The bank account holds what its browser showed after the receipt: 1464.00, "D".
+    // The bank account holds the client's receipt, 1464.00, and the dollar receipt
+    // valued at its own day's rate, 952.38.
     Outcome bank = run("hledger -f " + quote(journal) + " balance 512100 --no-total");
-    EXPECT_NE(bank.out.find("1464.00 EUR  512100"), std::string::npos) << bank.out;
+    EXPECT_NE(bank.out.find("2416.38 EUR  512100"), std::string::npos) << bank.out;
+    // Every settled client is left with nothing open in euros, exchange difference booked.
+    for (const char* client : {"411001", "411006"}) {
+      Outcome settled = run("hledger -f " + quote(journal) + " balance " + client + " --no-total");
+      EXPECT_EQ(settled.out.find(client), std::string::npos) << settled.out;
+    }
   }
   std::filesystem::remove(journal);
 

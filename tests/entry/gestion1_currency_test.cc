@@ -237,7 +237,7 @@ TEST_F(DevisesTest, TheLedgerListingAndTheExportShowTheDecimalsOfTheKeepingCurre
   std::ostringstream listing, hledger;
   app::imprimerGrandLivre(base(), listing);
   app::exporterHledger(base(), hledger);
-  EXPECT_NE(listing.str().find("échéance du 2024-03-15 : 1794\n"), std::string::npos) << listing.str();
+  EXPECT_NE(listing.str().find("échéance du 2024-03-15 : 1794, ouverte\n"), std::string::npos) << listing.str();
   EXPECT_NE(listing.str().find("débit 1794 XPF, crédit 1794 XPF"), std::string::npos) << listing.str();
   EXPECT_NE(hledger.str().find("411001    1794 XPF"), std::string::npos) << hledger.str();
   EXPECT_EQ(listing.str().find("1794.00"), std::string::npos) << listing.str();

@@ -440,3 +440,51 @@ TEST_F(KindsTest, ALineAccountClosedOrGoneBeforeSavingStopsTheSave) {
 }
 
 }  // namespace
+
+// A bank line on a client opens the justification of its due dates when the dossier
+// justifies them; a line that changes account loses what it justified.
+TEST_F(KindsTest, ABankLineJustifiesItsClientsDueDatesAndLosesThemWithItsAccount) {
+  sql("INSERT INTO PIECE (NPIES, NPIEC, NUMJL, DTOPE, DTPIE, MONNAIE_IDENT, COURS) VALUES ('00000000001', 'VT1', "
+      "'VT', '2024-03-01', '2024-03-01', 'EUR', 1)");
+  sql("INSERT INTO MOUVE (UNIQ, NPIES, NLIGS, NUMCP, NUMJL, DTOPE, MTDEB, INDX2) VALUES (1, '00000000001', "
+      "'000000000010001', '411001', 'VT', '2024-03-01', '1200', '411001|2024-03-01')");
+  sql("INSERT INTO ECHEA (NUSYS, UNIQ, NPIES, INDX1, DTECH, MTECH, MTECHS, MTRES, MTRESS) VALUES (1, 1, "
+      "'00000000001', '1', '2024-04-01', '1200', '1200', '1200', '1200')");
+  auto justifier = [this] {
+    user_.ajouterPilotage([](host::Session& s, host::Automate&) {
+      model::appuyer(s, "VALID");  // the remainder on the due date
+      model::appuyer(s, "VALID");
+    });
+  };
+  auto ouvertures = [this] {
+    auto shown = session().transcript().textes("ouvre");
+    return std::count(shown.begin(), shown.end(), "MIRVAE-GEST_JUS");
+  };
+  kind_ = 4;
+  const struct {
+    const char *cas, *pfo13, *then, *amount;
+    long long opened, kept;
+  } cases[] = {
+      {"non géré par le dossier", "N", "", "", 0, 0},
+      {"justifiée", "O", "", "", 1, 1},
+      {"autre client", "O", "411002", "1200", 2, 0},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.cas);
+    sql("UPDATE PARAM SET PFO13 = '" + std::string(c.pfo13) + "'");
+    ASSERT_TRUE(creer());
+    session().transcript().vider();
+    if (*c.pfo13 == 'O') justifier();
+    ASSERT_TRUE(ligne("411001", "1200"));
+    if (*c.then) {
+      ASSERT_TRUE(model::allerLigne(session(), 1));
+      ASSERT_TRUE(saisir("LST_MIRVAL.NUMCP", c.then));
+      ASSERT_TRUE(saisir("LST_V_HT", c.amount));
+      ASSERT_TRUE(model::validerLigne(session()));
+    }
+    EXPECT_EQ(ouvertures(), c.opened);
+    EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAJUS_M01"), c.kept);
+    model::fermer(session());
+    sql("DELETE FROM MIRVAJUS_M01");
+  }
+}

@@ -3,6 +3,8 @@
 
 #include <gtest/gtest.h>
 
+#include "host/currency.h"
+#include "host/decimal.h"
 #include "services/cppiece.h"
 #include "tests/posting/posting_fixture.h"
 #include "tests/support/library_double.h"
@@ -12,6 +14,7 @@ namespace {
 using testing_support::LigneEssai;
 using testing_support::OperationEssai;
 using Strings = std::vector<std::string>;
+using host::Decimal;
 
 class CreerPieceTest : public testing_support::PostingTest {
  protected:
@@ -346,22 +349,207 @@ TEST_F(CreerPieceTest, NpiesReplacedAsSoonAsDebutPieceSucceeds) {
   EXPECT_EQ(npies("OP000002"), "00000000999");
 }
 
-TEST_F(CreerPieceTest, ABankLineWithAJustifiedDueDateIsNotPostedWithoutItsSettlement) {
-  ecrire({.type = "BQ", .lignes = {{"411001", "120"}, {"706000", "30"}}, .numcp = "512100", .numjl = "BQ1",
-          .typeDr = "R"});
-  // Due date 42 of the client is justified on the first line; the second has none.
-  sql("INSERT INTO MIRVAJUS (IDENTR, NUSYS, MTREG) SELECT IDENT, 42, '120' FROM MIRVAL WHERE NUMCP = '411001'");
-  poster("OP000001", "BQ");
-  std::vector<std::string> errors = session().transcript().textes("erreur");
-  ASSERT_FALSE(errors.empty());
-  EXPECT_NE(errors.back().find("L'échéance n° 42 est justifiée sur cette opération"), std::string::npos)
-      << errors.back();
-  EXPECT_EQ(compte("SELECT count(*) FROM PIECE"), 0);
-  EXPECT_EQ(compte("SELECT count(*) FROM MOUVE"), 0);
+// Invoices posted, then settled by bank lines whose justification rows hold what the
+// justification screen computes: the settled amount at the settlement rate, and the
+// exchange difference against the invoice's rate.
+class ReglementTest : public CreerPieceTest {
+ protected:
+  struct Facture {
+    std::string ident, type, numcp, montant, monnaie, cours;
+  };
+  // Posts the invoice and gives the system number of its due date.
+  std::string facturer(const Facture& f) {
+    ecrire({.ident = f.ident, .type = f.type, .lignes = {{f.type == "FC" ? "706000" : "601000", f.montant}},
+            .numcp = f.numcp, .numjl = f.type == "FC" ? "VT" : "AC", .monnaie = f.monnaie, .cours = f.cours});
+    poster(f.ident, f.type);
+    return sql("SELECT NUSYS FROM ECHEA WHERE NPIES = '" + npies(f.ident) + "' AND UNIQR = 0");
+  }
+  // A bank operation of one line on `numcp` settling `echeance` for the whole line,
+  // receipt ("R") or payment ("D"), posted.
+  void regler(const std::string& ident, const std::string& typeDr, const std::string& numcp,
+              const std::string& echeance, const std::string& montant, const std::string& monnaie,
+              const std::string& cours, const std::string& coursFacture) {
+    ecrire({.ident = ident, .type = "BQ", .lignes = {{numcp, montant}}, .numcp = "512100", .numjl = "BQ1",
+            .monnaie = monnaie, .cours = cours, .typeDr = typeDr});
+    host::Devises& devises = host::euro();
+    Decimal regs = *Decimal::parse(montant);
+    auto enEuros = [&](const std::string& rate) {
+      return monnaie == "EUR" ? regs : devises.reprice(regs, *Decimal::parse(rate), Decimal(1), "EUR");
+    };
+    Decimal reg = enEuros(cours), ecart = monnaie == "EUR" ? Decimal() : enEuros(coursFacture) - reg;
+    sql("INSERT INTO MIRVAJUS (IDENTR, NUSYS, MTREG, MTREGS, MTECHG) VALUES ('" + ident + "-1', " + echeance + ", '" +
+        reg.toString(2) + "', '" + montant + "', '" + ecart.toString(2) + "')");
+    poster(ident, "BQ");
+  }
+  // The account's balance in euros, summed exactly.
+  std::string solde(const std::string& numcp) {
+    Decimal total;
+    host::Statement& s = base().prepare("SELECT MTDEB, MTCRE FROM MOUVE WHERE NUMCP = ?");
+    s.bind(1, numcp);
+    while (s.step()) total += *Decimal::parse(s.text(0)) - *Decimal::parse(s.text(1));
+    s.reset();
+    return total.toString(2);
+  }
+  std::string sql(const std::string& query) {
+    host::Statement& s = base().prepare(query);
+    std::string value = s.step() ? s.text(0) : std::string();
+    s.reset();
+    return value;
+  }
+};
 
-  sql("DELETE FROM MIRVAJUS");
-  poster("OP000001", "BQ");
-  EXPECT_EQ(compte("SELECT count(*) FROM PIECE"), 1);
+// A full settlement leaves the tiers account at exactly 0 in euros, the due date paid
+// and closed, every movement of the invoice lettered together; an exchange difference
+// goes to the exchange journal, on the gain or loss account by its side.
+TEST_F(ReglementTest, AFullSettlementClosesTheInvoiceAndBooksItsExchangeDifference) {
+  struct Case {
+    const char* name;
+    Facture facture;
+    const char* typeDr;
+    const char* coursReglement;
+    Strings ecart;  // the movements of the exchange piece
+  };
+  const Case cases[] = {
+      {"euros", {"F1", "FC", "411001", "1200", "EUR", "1"}, "R", "1", {}},
+      {"dollar plus cher à l'encaissement : gain",
+       {"F2", "FC", "411002", "1000", "USD", "1.10"}, "R", "1.05",
+       {"411002 D 43.29", "766000 C 43.29"}},
+      {"dollar moins cher à l'encaissement : perte",
+       {"F3", "FC", "411003", "1000", "USD", "1.05"}, "R", "1.10",
+       {"411003 C 43.29", "666000 D 43.29"}},
+      {"fournisseur payé en dollars plus chers : perte",
+       {"F4", "FF", "401001", "1000", "USD", "1.10"}, "D", "1.05",
+       {"401001 C 43.29", "666000 D 43.29"}},
+  };
+  int n = 0;
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    std::string nusys = facturer(c.facture);
+    ASSERT_FALSE(nusys.empty());
+    std::string reglement = "R" + std::to_string(++n);
+    regler(reglement, c.typeDr, c.facture.numcp, nusys, c.facture.montant, c.facture.monnaie, c.coursReglement,
+           c.facture.cours);
+    ASSERT_FALSE(npies(reglement).empty()) << testing::PrintToString(session().transcript().textes("erreur"));
+    EXPECT_EQ(solde(c.facture.numcp), "0.00");
+    EXPECT_EQ(sql("SELECT (UNIQR <> 0) || ' ' || MTRES || ' ' || MTRESS FROM ECHEA WHERE NUSYS = " + nusys), "1 0 0");
+    EXPECT_EQ(sql("SELECT count(DISTINCT RELET) || ' ' || min(RELET = upper(RELET) AND DTLET <> '') FROM MOUVE "
+                  "WHERE NUMCP = '" + c.facture.numcp + "'"),
+              "1 1");
+    std::string ecart = sql("SELECT NPIES FROM PIECE WHERE NUMJL = 'ODC' AND NPIES > '" + npies(reglement) + "'");
+    EXPECT_EQ(ecart.empty() ? Strings{} : mouvements(ecart), c.ecart);
+  }
+  EXPECT_EQ(sql("SELECT count(*) FROM EAEUR"), "0");
+}
+
+// Dollar invoices paid in several parts at many rates: each part leaves a due date for
+// the rest, still offered; the last one leaves not one cent on the tiers account.
+TEST_F(ReglementTest, PartialPaymentsAtManyRatesLeaveNoResidualCent) {
+  struct Case {
+    const char* montant;
+    const char* coursFacture;
+    std::vector<std::pair<const char*, const char*>> parts;  // amount, rate
+  };
+  const Case cases[] = {
+      {"1000.01", "1.1", {{"333.33", "1.2"}, {"333.33", "1.05"}, {"333.35", "0.97"}}},
+      {"99.99", "1.3194", {{"0.01", "1.1"}, {"99.98", "1.2271"}}},
+      {"12345.67", "1.0387", {{"5000", "1.1050"}, {"7000", "1.1"}, {"345.67", "1.0666"}}},
+  };
+  int n = 0;
+  for (const Case& c : cases) {
+    std::string facture = "F" + std::to_string(++n), client = "41100" + std::to_string(n);
+    SCOPED_TRACE(facture);
+    std::string nusys = facturer({facture, "FC", client, c.montant, "USD", c.coursFacture});
+    for (std::size_t p = 0; p < c.parts.size(); ++p) {
+      std::string reglement = facture + "R" + std::to_string(p);
+      regler(reglement, "R", client, nusys, c.parts[p].first, "USD", c.parts[p].second, c.coursFacture);
+      ASSERT_FALSE(npies(reglement).empty()) << testing::PrintToString(session().transcript().textes("erreur"));
+      nusys = sql("SELECT NUSYS FROM ECHEA WHERE NPIES = '" + npies(facture) + "' AND UNIQR = 0");
+      bool last = p + 1 == c.parts.size();
+      EXPECT_EQ(nusys.empty(), last);
+      // Until the last part the invoice stays unlettered, so that its rest is offered.
+      EXPECT_EQ(sql("SELECT RELET <> '' FROM MOUVE WHERE NUMCP = '" + client + "' AND NPIES = '" + npies(facture) +
+                    "'"),
+                last ? "1" : "0");
+    }
+    EXPECT_EQ(solde(client), "0.00");
+    EXPECT_EQ(sql("SELECT sum(MTPAYS) FROM ECHEA WHERE NPIES = '" + npies(facture) + "'"),
+              Decimal::parse(c.montant)->toString(0));
+  }
+}
+
+// One payment that closes an invoice and the rest of another, partly paid before,
+// joins both settlements into one lettering, which balances to the cent.
+TEST_F(ReglementTest, APaymentOfTwoInvoicesLettersThemTogether) {
+  std::string a = facturer({"FA", "FC", "411001", "100", "USD", "1.1"});
+  std::string b = facturer({"FB", "FC", "411001", "200", "USD", "1.2"});
+  regler("R1", "R", "411001", a, "50", "USD", "1.3", "1.1");
+  std::string rest = sql("SELECT NUSYS FROM ECHEA WHERE NPIES = '" + npies("FA") + "' AND UNIQR = 0");
+  ecrire({.ident = "R2", .type = "BQ", .lignes = {{"411001", "250"}}, .numcp = "512100", .numjl = "BQ1",
+          .monnaie = "USD", .cours = "0.9", .typeDr = "R"});
+  // Settled at 0.9: 200 USD are 222.22 EUR against 166.67, 50 USD 55.56 against 45.45.
+  sql("INSERT INTO MIRVAJUS (IDENTR, NUSYS, MTREG, MTREGS, MTECHG) VALUES ('R2-1', " + b +
+      ", '222.22', '200', '-55.55'), ('R2-1', " + rest + ", '55.56', '50', '-10.11')");
+  poster("R2", "BQ");
+  ASSERT_FALSE(npies("R2").empty()) << testing::PrintToString(session().transcript().textes("erreur"));
+  EXPECT_EQ(solde("411001"), "0.00");
+  EXPECT_EQ(sql("SELECT count(DISTINCT RELET) || ' ' || min(RELET = upper(RELET) AND RELET <> '') FROM MOUVE "
+                "WHERE NUMCP = '411001'"),
+            "1 1");
+  EXPECT_EQ(sql("SELECT count(DISTINCT RELET) FROM ECHEA WHERE NPIES IN ('" + npies("FA") + "', '" + npies("FB") +
+                "')"),
+            "1");
+}
+
+// What cannot be settled stops the posting whole: no piece, no settlement, no
+// difference, and the reason said.
+TEST_F(ReglementTest, ASettlementThatCannotBeMadePostsNothing) {
+  std::string nusys = facturer({"F1", "FC", "411001", "1200", "EUR", "1"});
+  std::string uniq = sql("SELECT UNIQ FROM ECHEA WHERE NUSYS = " + nusys);
+  struct Case {
+    const char* name;
+    std::string before, after;  // the ledger as the bank line finds it, and put back
+    const char* message;
+  };
+  const Case cases[] = {
+      {"déjà réglée", "UPDATE ECHEA SET UNIQR = 999", "UPDATE ECHEA SET UNIQR = 0", "est déjà réglée"},
+      {"disparue", "UPDATE ECHEA SET NUSYS = 777", "UPDATE ECHEA SET NUSYS = " + nusys, "n'existe plus"},
+      {"mouvement illisible", "UPDATE ECHEA SET UNIQ = 555", "UPDATE ECHEA SET UNIQ = " + uniq,
+       "Lecture impossible sur < MOUVE1.UNIQ,EgalA,ECHEA.UNIQ > = 555"},
+  };
+  std::string ledger = sql("SELECT group_concat(NUSYS || UNIQ || UNIQR || MTRES) FROM ECHEA");
+  int n = 0;
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    base().exec(c.before);
+    std::string reglement = "R" + std::to_string(++n);
+    session().transcript().vider();
+    regler(reglement, "R", "411001", nusys, "1200", "EUR", "1", "1");
+    Strings errors = session().transcript().textes("erreur");
+    ASSERT_FALSE(errors.empty());
+    EXPECT_NE(errors.back().find(c.message), std::string::npos) << errors.back();
+    EXPECT_EQ(sql("SELECT count(*) FROM PIECE WHERE NUMJL = 'BQ1'"), "0");
+    EXPECT_EQ(sql("SELECT count(*) FROM MOUVE WHERE RELET <> ''"), "0");
+    base().exec(c.after);
+    EXPECT_EQ(sql("SELECT group_concat(NUSYS || UNIQ || UNIQR || MTRES) FROM ECHEA"), ledger);
+  }
+}
+
+// Once settled, neither the invoice nor the bank operation may be changed: the
+// invoice is (partly) paid, the bank movement is lettered.
+TEST_F(ReglementTest, ASettledInvoiceAndItsSettlementRefuseModification) {
+  std::string nusys = facturer({"F1", "FC", "411001", "1200", "EUR", "1"});
+  regler("R1", "R", "411001", nusys, "200", "EUR", "1", "1");
+  for (const auto& [ident, message] :
+       std::vector<std::pair<std::string, std::string>>{{"F1", "partiellement réglée"}, {"R1", "lettré ou pointé"}}) {
+    session().transcript().vider();
+    host::Entier flag(0);
+    host::Chaine piece(npies(ident));
+    host::EvtParamRef evt(2, &flag, &piece);
+    lancer("MIRVAE-VERIFIER_MODIF_PIECE", evt);
+    EXPECT_EQ(flag.entier(), 1) << ident;
+    ASSERT_FALSE(messages().empty()) << ident;
+    EXPECT_NE(messages().back().find(message), std::string::npos) << messages().back();
+  }
 }
 
 TEST_F(CreerPieceTest, LedgerUnreachableStopsWithOneMessage) {
