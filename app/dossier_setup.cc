@@ -281,7 +281,7 @@ void afficherOptions(host::Database& db, std::ostream& out) {
   eachOption([&](const Option& o) {
     std::string value = storedValue(db, o);
     std::size_t shown = host::text::length(value);
-    out << std::left << std::setw(12) << o.name << value << std::string(shown < 14 ? 14 - shown : 2, ' ')
+    out << std::left << std::setw(18) << o.name << value << std::string(shown < 14 ? 14 - shown : 2, ' ')
         << o.description << "\n";
   });
 }
