@@ -14,11 +14,13 @@ namespace app {
 
 DossierCommands::DossierCommands(CLI::App& program, CLI::App& init, CLI::App& exportCommand)
     : init_(&init), export_(&exportCommand) {
-  init.add_option("--company", company_, "Crée le dossier d'une société : plan comptable, TVA, journaux, paramètres")
-      ->excludes(init.get_option("--demo"));
+  CLI::Option* company =
+      init.add_option("--company", company_, "Crée le dossier d'une société : plan comptable, TVA, journaux, paramètres")
+          ->excludes(init.get_option("--demo"));
   init.add_option("--exercise-start", exerciseStart_,
-                  "Premier jour de l'exercice de douze mois (JJ/MM/AAAA ; 1er janvier de l'année en cours sinon)");
-  init.add_option("--currency", currency_, "Devise de tenue du dossier")->capture_default_str();
+                  "Premier jour de l'exercice de douze mois (JJ/MM/AAAA ; 1er janvier de l'année en cours sinon)")
+      ->needs(company);
+  init.add_option("--currency", currency_, "Devise de tenue du dossier")->capture_default_str()->needs(company);
 
   set_ = program.add_subcommand("set", "Change une option du dossier (mirvae show les liste)");
   set_->add_option("DOSSIER", dossier_, "Dossier")->required()->check(CLI::ExistingFile);
