@@ -204,6 +204,14 @@ bool found(host::Database& db, const char* sql, const std::string& a, const std:
   return any;
 }
 
+std::string firstText(host::Database& db, const char* sql, const std::string& key) {
+  host::Statement& s = db.prepare(sql);
+  s.bind(1, key);
+  std::string value = s.step() ? s.text(0) : std::string();
+  s.reset();
+  return value;
+}
+
 using Values = std::map<std::string, std::string>;
 
 // The reason a row cannot be written, nothing when it can. Values may be completed
@@ -217,13 +225,14 @@ std::optional<std::string> checkAccount(host::Database& db, ImportKind kind, Val
   if (host::text::length(v["LIBCP"]) > 60) return std::string("libellé de plus de 60 caractères");
   if (found(db, "SELECT 1 FROM COMPT WHERE LIBCP = ?1 AND NUMCP <> ?2", v["LIBCP"], number))
     return "le libellé « " + v["LIBCP"] + " » est déjà celui d'un autre compte";
-  if (kind == ImportKind::tiers && !v.count("NATUC")) {
-    // A tiers' nature follows its number, as the chart of accounts files them.
+  if (kind == ImportKind::tiers && !v.count("NATUC") && !found(db, "SELECT 1 FROM COMPT WHERE NUMCP = ?", number)) {
+    // A new tiers' nature follows its number, as the chart of accounts files them.
     v["NATUC"] = number.rfind("411", 0) == 0 ? "C" : number.rfind("401", 0) == 0 ? "F"
                : number.rfind("421", 0) == 0 ? "A" : "";
   }
-  if (v.count("NATUC")) {
-    const std::string& nature = v["NATUC"];
+  if (v.count("NATUC") || kind == ImportKind::tiers) {
+    const std::string nature =
+        v.count("NATUC") ? v["NATUC"] : firstText(db, "SELECT NATUC FROM COMPT WHERE NUMCP = ?", number);
     if (nature.find_first_not_of("CFABIPHMTUQRS") != std::string::npos)
       return "nature « " + nature + " » : lettres permises C F A B I P H M T U Q R S";
     if (kind == ImportKind::tiers && nature.find_first_of("CFA") == std::string::npos)

@@ -95,6 +95,39 @@ void checkExercise(year_month_day first, year_month_day last) {
     refuse("un exercice dure au plus 24 mois (du " + host::jourTexte(first) + " au " + host::jourTexte(last) + ")");
 }
 
+// A value among a few codes, as a template argument so that each list is a plain
+// function an option can point to.
+template <std::size_t N>
+struct Code {
+  constexpr Code(const char (&text)[N]) { std::copy_n(text, N, value); }
+  char value[N];
+};
+
+template <Code... allowed>
+std::string oneOf(host::Database&, std::string_view v) {
+  if (((v != std::string_view(allowed.value)) && ...)) {
+    std::string list;
+    ((list += (list.empty() ? "" : ", ") + std::string(*allowed.value ? allowed.value : "vide")), ...);
+    refuse("valeurs permises : " + list);
+  }
+  return std::string(v);
+}
+
+std::string flag(host::Database&, std::string_view v) {
+  if (v != "0" && v != "1") refuse("valeurs permises : 1 (oui), 0 (non)");
+  return std::string(v);
+}
+
+std::string account(host::Database& db, std::string_view v) {
+  if (!exists(db, "SELECT 1 FROM COMPT WHERE NUMCP = ?", std::string(v))) refuse("compte inconnu");
+  return std::string(v);
+}
+
+std::string journal(host::Database& db, std::string_view v) {
+  if (!exists(db, "SELECT 1 FROM JONAL WHERE NUMJL = ?", std::string(v))) refuse("journal inconnu");
+  return std::string(v);
+}
+
 struct Option {
   const char* name;
   bool company;        // a DOSSIER_INFO key; otherwise a PARAM column of the same name
@@ -150,56 +183,20 @@ const Option kOptions[] = {
                 ") et la fin de l'exercice suivant");
        return host::jourIso(closing);
      }, "Date de clôture : dernière date d'opération ouverte à la saisie"},
-    {"PXCLO", false, [](host::Database&, std::string_view v) {
-       if (v != "N" && v != "C" && v != "O") refuse("valeurs permises : N, C, O");
-       return std::string(v);
-     }, "État de l'exercice : N ouvert, C clôturé mais réouvrable, O clôturé"},
-    {"PRE18", false, [](host::Database&, std::string_view v) {
-       if (v != "O" && v != "N") refuse("valeurs permises : O, N");
-       return std::string(v);
-     }, "O : opérations simplifiées en service"},
-    {"PRE19", false, [](host::Database&, std::string_view v) {
-       if (v != "1" && v != "0") refuse("valeurs permises : 1, 0");
-       return std::string(v);
-     }, "1 : lignes de banque et de caisse sur comptes de charges ou de produits, 0 : sur comptes de tiers"},
-    {"PFO13", false, [](host::Database&, std::string_view v) {
-       if (v != "O" && v != "N") refuse("valeurs permises : O, N");
-       return std::string(v);
-     }, "O : les lignes de banque et de caisse justifient les échéances réglées"},
-    {"PMTVA", false, [](host::Database&, std::string_view v) {
-       if (v != "D" && v != "E" && !v.empty()) refuse("valeurs permises : D, E ou vide");
-       return std::string(v);
-     }, "Exigibilité de la TVA : D sur les débits, E sur les encaissements, vide selon le compte"},
-    {"PCECC", false, [](host::Database& db, std::string_view v) {
-       if (!exists(db, "SELECT 1 FROM COMPT WHERE NUMCP = ?", std::string(v))) refuse("compte inconnu");
-       return std::string(v);
-     }, "Compte des pertes de change"},
-    {"PCECP", false, [](host::Database& db, std::string_view v) {
-       if (!exists(db, "SELECT 1 FROM COMPT WHERE NUMCP = ?", std::string(v))) refuse("compte inconnu");
-       return std::string(v);
-     }, "Compte des gains de change"},
-    {"PCEEC", false, [](host::Database& db, std::string_view v) {
-       if (!exists(db, "SELECT 1 FROM COMPT WHERE NUMCP = ?", std::string(v))) refuse("compte inconnu");
-       return std::string(v);
-     }, "Compte des écarts d'arrondi débiteurs"},
-    {"PCEEP", false, [](host::Database& db, std::string_view v) {
-       if (!exists(db, "SELECT 1 FROM COMPT WHERE NUMCP = ?", std::string(v))) refuse("compte inconnu");
-       return std::string(v);
-     }, "Compte des écarts d'arrondi créditeurs"},
-    {"PJOCHAN", false, [](host::Database& db, std::string_view v) {
-       if (!exists(db, "SELECT 1 FROM JONAL WHERE NUMJL = ?", std::string(v))) refuse("journal inconnu");
-       return std::string(v);
-     }, "Journal des écarts de change"},
-    {"PJOEURO", false, [](host::Database& db, std::string_view v) {
-       if (!exists(db, "SELECT 1 FROM JONAL WHERE NUMJL = ?", std::string(v))) refuse("journal inconnu");
-       return std::string(v);
-     }, "Journal des écarts d'arrondi"},
+    {"PXCLO", false, oneOf<"N", "C", "O">, "État de l'exercice : N ouvert, C clôturé mais réouvrable, O clôturé"},
+    {"PRE18", false, oneOf<"O", "N">, "O : opérations simplifiées en service"},
+    {"PRE19", false, oneOf<"1", "0">,
+     "1 : lignes de banque et de caisse sur comptes de charges ou de produits, 0 : sur comptes de tiers"},
+    {"PFO13", false, oneOf<"O", "N">, "O : les lignes de banque et de caisse justifient les échéances réglées"},
+    {"PMTVA", false, oneOf<"D", "E", "">,
+     "Exigibilité de la TVA : D sur les débits, E sur les encaissements, vide selon le compte"},
+    {"PCECC", false, account, "Compte des pertes de change"},
+    {"PCECP", false, account, "Compte des gains de change"},
+    {"PCEEC", false, account, "Compte des écarts d'arrondi débiteurs"},
+    {"PCEEP", false, account, "Compte des écarts d'arrondi créditeurs"},
+    {"PJOCHAN", false, journal, "Journal des écarts de change"},
+    {"PJOEURO", false, journal, "Journal des écarts d'arrondi"},
 };
-
-std::string flag(host::Database&, std::string_view v) {
-  if (v != "0" && v != "1") refuse("valeurs permises : 1 (oui), 0 (non)");
-  return std::string(v);
-}
 
 const Option kFlags[] = {
     {"OPT_TVA", false, flag, "Gestion de la TVA"},

@@ -385,7 +385,7 @@ TEST_F(MirvaeRunTest, AnOptionOutOfRangeIsRefusedAndLeavesTheDossierAsItWas) {
       {"PDFEX", "31/12/2026", "au plus 24 mois"},
       {"PDFEX", "31/02/2025", "n'est pas une date"},
       {"PDTCL", "30/06/2024", "la date de clôture doit tomber"},
-      {"PMTVA", "X", "valeurs permises : D, E ou vide"},
+      {"PMTVA", "X", "valeurs permises : D, E, vide"},
       {"PMTVA", "E", ""},
       {"PCECC", "999999", "compte inconnu"},
       {"OPT_ANA", "2", "valeurs permises : 1 (oui), 0 (non)"},
