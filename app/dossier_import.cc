@@ -311,45 +311,39 @@ ImportReport importer(host::Database& db, ImportKind kind, const std::string& fi
   Csv csv = readCsv(file);
   auto at = placeColumns(kind, csv.header);
   ImportReport report;
-  db.begin();
-  try {
-    for (const Row& row : csv.rows) {
-      auto refuse = [&](const std::string& why) {
-        report.refused.push_back("ligne " + std::to_string(row.line) + " : " + why);
-      };
-      if (!row.error.empty()) {
-        refuse(row.error);
-        continue;
-      }
-      if (row.fields.size() != csv.header.size()) {
-        refuse(std::to_string(row.fields.size()) + " champs pour " + std::to_string(csv.header.size()) +
-               " colonnes d'en-tête");
-        continue;
-      }
-      Values v;
-      std::optional<std::string> why;
-      for (const auto& [column, index] : at) {
-        v[column] = row.fields[index];
-        if (auto flaw = host::text::flaw(v[column])) why = column + " : " + *flaw;
-      }
-      if (!why) why = kind == ImportKind::rates ? checkRate(db, v) : checkAccount(db, kind, v);
-      if (why) {
-        refuse(*why);
-        continue;
-      }
-      write(db, kind, v);
-      ++report.written;
+  host::Transaction unit(db);
+  for (const Row& row : csv.rows) {
+    auto refuse = [&](const std::string& why) {
+      report.refused.push_back("ligne " + std::to_string(row.line) + " : " + why);
+    };
+    if (!row.error.empty()) {
+      refuse(row.error);
+      continue;
     }
-    if (!report.refused.empty() && !skipBad) {
-      db.rollback();
-      report.written = 0;
-      return report;
+    if (row.fields.size() != csv.header.size()) {
+      refuse(std::to_string(row.fields.size()) + " champs pour " + std::to_string(csv.header.size()) +
+             " colonnes d'en-tête");
+      continue;
     }
-    db.commit();
-  } catch (...) {
-    db.rollback();
-    throw;
+    Values v;
+    std::optional<std::string> why;
+    for (const auto& [column, index] : at) {
+      v[column] = row.fields[index];
+      if (auto flaw = host::text::flaw(v[column])) why = column + " : " + *flaw;
+    }
+    if (!why) why = kind == ImportKind::rates ? checkRate(db, v) : checkAccount(db, kind, v);
+    if (why) {
+      refuse(*why);
+      continue;
+    }
+    write(db, kind, v);
+    ++report.written;
   }
+  if (!report.refused.empty() && !skipBad) {
+    report.written = 0;
+    return report;
+  }
+  unit.commit();
   return report;
 }
 

@@ -27,25 +27,6 @@ std::string sqlLiteral(const std::string& text) {
   return out + "'";
 }
 
-// One unit of work on the dossier: rolled back unless committed.
-class Transaction {
- public:
-  explicit Transaction(host::Database& db) : db_(db) { db_.begin(); }
-  ~Transaction() {
-    if (!done_) db_.rollback();
-  }
-  Transaction(const Transaction&) = delete;
-  Transaction& operator=(const Transaction&) = delete;
-  void commit() {
-    db_.commit();
-    done_ = true;
-  }
-
- private:
-  host::Database& db_;
-  bool done_ = false;
-};
-
 std::string firstValue(host::Database& db, const std::string& sql, const std::string& parameter = {}) {
   host::Statement& s = db.prepare(sql);
   if (sql.find('?') != std::string::npos) s.bind(1, parameter);
@@ -251,7 +232,7 @@ void definirOption(host::Database& db, const std::string& option, const std::str
     if (option == o.name) found = &o;
   });
   if (!found) throw host::HostError("option inconnue « " + option + " » (mirvae show liste les options)");
-  Transaction unit(db);
+  host::Transaction unit(db);
   std::string stored;
   try {
     stored = found->check(db, value);
