@@ -14,9 +14,9 @@ namespace app {
 
 DossierCommands::DossierCommands(CLI::App& program, CLI::App& init, CLI::App& exportCommand)
     : init_(&init), export_(&exportCommand) {
-  CLI::Option* company =
-      init.add_option("--company", company_, "Crée le dossier d'une société : plan comptable, TVA, journaux, paramètres")
-          ->excludes(init.get_option("--demo"));
+  CLI::Option* company = init.add_option("--company", company_,
+                                         "Crée le dossier d'une société : plan comptable, TVA, journaux, paramètres")
+                             ->excludes(init.get_option("--demo"));
   init.add_option("--exercise-start", exerciseStart_,
                   "Premier jour de l'exercice de douze mois (JJ/MM/AAAA ; 1er janvier de l'année en cours sinon)")
       ->needs(company);
@@ -70,7 +70,9 @@ std::optional<int> DossierCommands::run(std::ostream& out, std::ostream& err) {
     return 0;
   }
   if (import_->parsed()) {
-    ImportKind kind = kind_ == "accounts" ? ImportKind::accounts : kind_ == "tiers" ? ImportKind::tiers : ImportKind::rates;
+    ImportKind kind = kind_ == "accounts" ? ImportKind::accounts
+                      : kind_ == "tiers"  ? ImportKind::tiers
+                                          : ImportKind::rates;
     ImportReport report = importer(*registry::ouvrirDossier(dossier_), kind, file_, skipBad_);
     for (const auto& why : report.refused) err << file_ << " : " << why << "\n";
     if (!report.refused.empty() && !skipBad_) {

@@ -57,10 +57,10 @@ bool validUtf8(std::string_view s) {
 // 0x80-0x9F, where it keeps the euro sign, typographic quotes, Œ and the like.
 // Bytes it leaves undefined are refused with their position.
 std::string fromCp1252(std::string_view s) {
-  static const char32_t high[32] = {0x20AC, 0, 0x201A, 0x0192, 0x201E, 0x2026, 0x2020, 0x2021,
-                                    0x02C6, 0x2030, 0x0160, 0x2039, 0x0152, 0, 0x017D, 0,
+  static const char32_t high[32] = {0x20AC, 0,      0x201A, 0x0192, 0x201E, 0x2026, 0x2020, 0x2021,
+                                    0x02C6, 0x2030, 0x0160, 0x2039, 0x0152, 0,      0x017D, 0,
                                     0,      0x2018, 0x2019, 0x201C, 0x201D, 0x2022, 0x2013, 0x2014,
-                                    0x02DC, 0x2122, 0x0161, 0x203A, 0x0153, 0, 0x017E, 0x0178};
+                                    0x02DC, 0x2122, 0x0161, 0x203A, 0x0153, 0,      0x017E, 0x0178};
   std::string out;
   for (std::size_t i = 0; i < s.size(); ++i) {
     unsigned char c = static_cast<unsigned char>(s[i]);
@@ -158,15 +158,16 @@ struct Column {
 
 const std::vector<Column>& columnsOf(ImportKind kind) {
   static const std::vector<Column> accounts = {
-      {"NUMCP", "compte", true},  {"LIBCP", "libelle", true}, {"NATUC", "nature", false},
-      {"COTVA", "tva", false},    {"TPTVA", "exigibilite", false}, {"CPOST", "poste", false},
-      {"CCRIT", "cle", false},    {"CSECT", "section", false}, {"SAANA", "analytique_obligatoire", false},
+      {"NUMCP", "compte", true}, {"LIBCP", "libelle", true},      {"NATUC", "nature", false},
+      {"COTVA", "tva", false},   {"TPTVA", "exigibilite", false}, {"CPOST", "poste", false},
+      {"CCRIT", "cle", false},   {"CSECT", "section", false},     {"SAANA", "analytique_obligatoire", false},
       {"CCTRA", "masque", false}};
-  static const std::vector<Column> tiers = {
-      {"NUMCP", "compte", true},         {"LIBCP", "nom", true},          {"NATUC", "nature", false},
-      {"ADRE1", "adresse", false},       {"ADRE2", "complement", false},  {"CPOCP", "code_postal", false},
-      {"VILCP", "ville", false},         {"CTYPR", "conditions", false},  {"JLTRT", "journal", false},
-      {"CTYEC", "type_echeance", false}, {"RGPAY", "mode_reglement", false}};
+  static const std::vector<Column> tiers = {{"NUMCP", "compte", true},         {"LIBCP", "nom", true},
+                                            {"NATUC", "nature", false},        {"ADRE1", "adresse", false},
+                                            {"ADRE2", "complement", false},    {"CPOCP", "code_postal", false},
+                                            {"VILCP", "ville", false},         {"CTYPR", "conditions", false},
+                                            {"JLTRT", "journal", false},       {"CTYEC", "type_echeance", false},
+                                            {"RGPAY", "mode_reglement", false}};
   static const std::vector<Column> rates = {
       {"IDENT", "devise", true}, {"DTCOURS", "date", true}, {"COURS", "cours", true}};
   return kind == ImportKind::accounts ? accounts : kind == ImportKind::tiers ? tiers : rates;
@@ -227,8 +228,10 @@ std::optional<std::string> checkAccount(host::Database& db, ImportKind kind, Val
     return "le libellé « " + v["LIBCP"] + " » est déjà celui d'un autre compte";
   if (kind == ImportKind::tiers && !v.count("NATUC") && !found(db, "SELECT 1 FROM COMPT WHERE NUMCP = ?", number)) {
     // A new tiers' nature follows its number, as the chart of accounts files them.
-    v["NATUC"] = number.rfind("411", 0) == 0 ? "C" : number.rfind("401", 0) == 0 ? "F"
-               : number.rfind("421", 0) == 0 ? "A" : "";
+    v["NATUC"] = number.rfind("411", 0) == 0   ? "C"
+                 : number.rfind("401", 0) == 0 ? "F"
+                 : number.rfind("421", 0) == 0 ? "A"
+                                               : "";
   }
   if (v.count("NATUC") || kind == ImportKind::tiers) {
     const std::string nature =

@@ -47,7 +47,9 @@ bool exists(host::Database& db, const std::string& sql, const std::string& key) 
 
 [[noreturn]] void refuse(const std::string& why) { throw host::HostError(why); }
 
-bool allDigits(std::string_view s) { return !s.empty() && std::all_of(s.begin(), s.end(), ::isdigit); }
+bool allDigits(std::string_view s) {
+  return !s.empty() && std::all_of(s.begin(), s.end(), [](char c) { return c >= '0' && c <= '9'; });
+}
 
 std::string cleanText(std::string_view value, std::size_t longest) {
   if (auto why = host::text::flaw(value)) refuse(*why);
@@ -111,26 +113,31 @@ std::string journal(host::Database& db, std::string_view v) {
 
 struct Option {
   const char* name;
-  bool company;        // a DOSSIER_INFO key; otherwise a PARAM column of the same name
+  bool company;  // a DOSSIER_INFO key; otherwise a PARAM column of the same name
   std::string (*check)(host::Database& db, std::string_view value);
   const char* description;
 };
 
 const Option kOptions[] = {
-    {"company_name", true, [](host::Database&, std::string_view v) {
+    {"company_name", true,
+     [](host::Database&, std::string_view v) {
        std::string text = cleanText(v, 100);
        if (text.empty()) refuse("le nom de la société ne peut être vide");
        return text;
-     }, "Raison sociale de la société"},
+     },
+     "Raison sociale de la société"},
     {"company_address", true, [](host::Database&, std::string_view v) { return cleanText(v, 100); },
      "Adresse (numéro et voie)"},
-    {"company_postcode", true, [](host::Database&, std::string_view v) {
+    {"company_postcode", true,
+     [](host::Database&, std::string_view v) {
        std::string text = cleanText(v, 5);
        if (!text.empty() && (text.size() != 5 || !allDigits(text))) refuse("un code postal a 5 chiffres");
        return text;
-     }, "Code postal"},
+     },
+     "Code postal"},
     {"company_town", true, [](host::Database&, std::string_view v) { return cleanText(v, 60); }, "Ville"},
-    {"company_siren", true, [](host::Database&, std::string_view v) {
+    {"company_siren", true,
+     [](host::Database&, std::string_view v) {
        std::string text;
        for (char c : v)
          if (c != ' ') text += c;
@@ -145,25 +152,32 @@ const Option kOptions[] = {
        }
        if (sum % 10 != 0) refuse("« " + text + " » n'est pas un SIREN : sa clé de contrôle est fausse");
        return text;
-     }, "SIREN (9 chiffres), qui nomme le fichier des écritures comptables"},
-    {"PDDEX", false, [](host::Database& db, std::string_view v) {
+     },
+     "SIREN (9 chiffres), qui nomme le fichier des écritures comptables"},
+    {"PDDEX", false,
+     [](host::Database& db, std::string_view v) {
        year_month_day first = dayOf(v);
        checkExercise(first, storedDay(db, "PDFEX"));
        return host::jourIso(first);
-     }, "Premier jour de l'exercice en cours"},
-    {"PDFEX", false, [](host::Database& db, std::string_view v) {
+     },
+     "Premier jour de l'exercice en cours"},
+    {"PDFEX", false,
+     [](host::Database& db, std::string_view v) {
        year_month_day last = dayOf(v);
        checkExercise(storedDay(db, "PDDEX"), last);
        return host::jourIso(last);
-     }, "Dernier jour de l'exercice en cours"},
-    {"PDTCL", false, [](host::Database& db, std::string_view v) {
+     },
+     "Dernier jour de l'exercice en cours"},
+    {"PDTCL", false,
+     [](host::Database& db, std::string_view v) {
        year_month_day closing = dayOf(v);
        year_month_day first = storedDay(db, "PDDEX"), last = storedDay(db, "PDFEX");
        if (sys_days(closing) < sys_days(first) || sys_days(closing) > sys_days(last + years(1)))
          refuse("la date de clôture doit tomber entre le début de l'exercice (" + host::jourTexte(first) +
                 ") et la fin de l'exercice suivant");
        return host::jourIso(closing);
-     }, "Date de clôture : dernière date d'opération ouverte à la saisie"},
+     },
+     "Date de clôture : dernière date d'opération ouverte à la saisie"},
     {"PXCLO", false, oneOf<"N", "C", "O">, "État de l'exercice : N ouvert, C clôturé mais réouvrable, O clôturé"},
     {"PRE18", false, oneOf<"O", "N">, "O : opérations simplifiées en service"},
     {"PRE19", false, oneOf<"1", "0">,
@@ -210,7 +224,8 @@ void creerSociete(const std::string& path, const Company& company) {
   if (auto why = host::text::flaw(company.name)) throw host::HostError("nom de société refusé : " + *why);
   if (host::text::trim(company.name).empty()) throw host::HostError("le nom de la société ne peut être vide");
   const std::string& currency = company.currency;
-  if (currency.size() != 3 || !std::all_of(currency.begin(), currency.end(), ::isupper))
+  if (currency.size() != 3 ||
+      !std::all_of(currency.begin(), currency.end(), [](char c) { return c >= 'A' && c <= 'Z'; }))
     throw host::HostError("« " + currency + " » n'est pas un code de devise (trois lettres majuscules, EUR)");
   year_month_day first = company.exerciseStart;
   year_month_day last = year_month_day(sys_days(first + months(12)) - days(1));

@@ -18,10 +18,10 @@ using host::Decimal;
 namespace {
 
 constexpr int kColumns = 18;
-const char* const kHeader[kColumns] = {"JournalCode", "JournalLib", "EcritureNum", "EcritureDate", "CompteNum",
-                                       "CompteLib", "CompAuxNum", "CompAuxLib", "PieceRef", "PieceDate",
-                                       "EcritureLib", "Debit", "Credit", "EcritureLet", "DateLet",
-                                       "ValidDate", "Montantdevise", "Idevise"};
+const char* const kHeader[kColumns] = {"JournalCode", "JournalLib",    "EcritureNum", "EcritureDate", "CompteNum",
+                                       "CompteLib",   "CompAuxNum",    "CompAuxLib",  "PieceRef",     "PieceDate",
+                                       "EcritureLib", "Debit",         "Credit",      "EcritureLet",  "DateLet",
+                                       "ValidDate",   "Montantdevise", "Idevise"};
 // Columns that may not be empty on any line.
 constexpr int kRequired[] = {0, 1, 2, 3, 4, 5, 8, 9, 10, 11, 12, 15};
 
@@ -67,9 +67,9 @@ std::optional<std::string> toLatin9(std::string_view s) {
     code = length == 1 ? c : length == 2 ? c & 0x1F : length == 3 ? c & 0x0F : c & 0x07;
     for (std::size_t k = 1; k < length; ++k) code = (code << 6) | (static_cast<unsigned char>(s[i + k]) & 0x3F);
     i += length;
-    static const std::map<char32_t, const char*> plain = {
-        {0x2018, "'"}, {0x2019, "'"}, {0x201C, "\""}, {0x201D, "\""}, {0x2013, "-"}, {0x2014, "-"},
-        {0x2026, "..."}, {0x202F, " "}, {0x2009, " "}};
+    static const std::map<char32_t, const char*> plain = {{0x2018, "'"},   {0x2019, "'"}, {0x201C, "\""},
+                                                          {0x201D, "\""},  {0x2013, "-"}, {0x2014, "-"},
+                                                          {0x2026, "..."}, {0x202F, " "}, {0x2009, " "}};
     static const std::map<char32_t, char> latin9 = {{0x20AC, '\xA4'}, {0x0160, '\xA6'}, {0x0161, '\xA8'},
                                                     {0x017D, '\xB4'}, {0x017E, '\xB8'}, {0x0152, '\xBC'},
                                                     {0x0153, '\xBD'}, {0x0178, '\xBE'}};
@@ -77,8 +77,8 @@ std::optional<std::string> toLatin9(std::string_view s) {
       out += p->second;
     } else if (auto l = latin9.find(code); l != latin9.end()) {
       out += l->second;
-    } else if (code < 0x100 && code != 0xA4 && code != 0xA6 && code != 0xA8 &&
-               code != 0xB4 && code != 0xB8 && code != 0xBC && code != 0xBD && code != 0xBE) {
+    } else if (code < 0x100 && code != 0xA4 && code != 0xA6 && code != 0xA8 && code != 0xB4 && code != 0xB8 &&
+               code != 0xBC && code != 0xBD && code != 0xBE) {
       out += static_cast<char>(code);
     } else {
       return std::nullopt;
@@ -136,8 +136,7 @@ FecFile exporterFec(host::Database& db, const FecRequest& request) {
       auto amount = [&](int column) {
         std::string stored = s.text(column);
         auto value = stored.empty() ? std::optional<Decimal>(Decimal()) : Decimal::parse(stored);
-        if (!value)
-          throw host::HostError("pièce " + line.npies + " : « " + stored + " » n'est pas un montant");
+        if (!value) throw host::HostError("pièce " + line.npies + " : « " + stored + " » n'est pas un montant");
         return *value;
       };
       line.debit = amount(9);
@@ -192,7 +191,8 @@ FecFile exporterFec(host::Database& db, const FecRequest& request) {
     for (int c = 0; c < kColumns; ++c) {
       const std::string& value = line.fields[c];
       if (host::text::flaw(value) || value.find(request.separator) != std::string::npos)
-        fault(std::string("le champ ") + kHeader[c] + " « " + value + " » contient le séparateur ou un caractère de contrôle");
+        fault(std::string("le champ ") + kHeader[c] + " « " + value +
+              " » contient le séparateur ou un caractère de contrôle");
       auto encoded = toLatin9(value);
       if (!encoded) fault(std::string("le champ ") + kHeader[c] + " « " + value + " » a un caractère hors ISO 8859-15");
       content += std::string(c ? 1 : 0, request.separator) + *encoded;
