@@ -6,6 +6,7 @@
 #include <iostream>
 #include <sstream>
 
+#include "app/dossier_commands.h"
 #include "app/exports.h"
 #include "app/script.h"
 #include "host/clock.h"
@@ -36,15 +37,18 @@ int main(int argc, char** argv) {
   CLI::App* ledger = program.add_subcommand("ledger", "Imprime les pièces et mouvements du grand livre");
   ledger->add_option("DOSSIER", dossier, "Dossier")->required()->check(CLI::ExistingFile);
 
-  CLI::App* exportCommand = program.add_subcommand("export", "Exporte le grand livre");
+  CLI::App* exportCommand = program.add_subcommand("export", "Exporte le grand livre (hledger) ou le fichier des écritures comptables (fec)");
   exportCommand->add_option("DOSSIER", dossier, "Dossier")->required()->check(CLI::ExistingFile);
-  exportCommand->add_option("--format", format, "Format d'export")->check(CLI::IsMember({"hledger"}));
+  exportCommand->add_option("--format", format, "Format d'export")->check(CLI::IsMember({"hledger", "fec"}));
   exportCommand->add_option("-o,--output", output, "Fichier de sortie (sinon la sortie standard)");
+
+  app::DossierCommands dossierCommands(program, *init, *exportCommand);
 
   CLI11_PARSE(program, argc, argv);
 
   try {
     app::chargerModules();
+    if (auto status = dossierCommands.run(std::cout, std::cerr)) return *status;
     if (init->parsed()) {
       registry::creerDossier(dossier, demo, host::clock::today());
       std::cout << "Dossier créé : " << dossier << (demo ? " (démonstration)" : "") << "\n";

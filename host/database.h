@@ -166,4 +166,23 @@ std::string quoteIdent(std::string_view name);
 // 'text' quoted for SQL, quotes doubled.
 std::string quoteText(std::string_view text);
 
+// A unit of work begun on construction and rolled back when left without commit().
+class Transaction {
+ public:
+  explicit Transaction(Database& db) : db_(db) { db_.begin(); }
+  ~Transaction() {
+    if (!done_) db_.rollback();
+  }
+  Transaction(const Transaction&) = delete;
+  Transaction& operator=(const Transaction&) = delete;
+  void commit() {
+    db_.commit();
+    done_ = true;
+  }
+
+ private:
+  Database& db_;
+  bool done_ = false;
+};
+
 }  // namespace host

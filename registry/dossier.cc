@@ -54,6 +54,18 @@ class BuildingFile {
 }  // namespace
 
 void creerDossier(const std::string& path, bool demo, year_month_day today) {
+  if (!demo) return creerDossier(path, std::string_view());
+  // The demo's exercise is the calendar year that holds the day it is made.
+  std::string sql = demo_sql;
+  year_month_day first{today.year(), January, day(1)};
+  year_month_day last{today.year(), December, day(31)};
+  replaceAll(sql, "{{PDDEX}}", host::jourIso(first));
+  replaceAll(sql, "{{PDFEX}}", host::jourIso(last));
+  replaceAll(sql, "{{PDTCL}}", host::jourIso(last));
+  creerDossier(path, sql);
+}
+
+void creerDossier(const std::string& path, std::string_view referenceSql) {
   if (std::filesystem::exists(path)) throw host::HostError("le fichier « " + path + " » existe déjà");
   // The dossier is made in a file of its own beside the target and takes the target's
   // name only once whole: a process killed half-way leaves nothing under that name,
@@ -64,16 +76,7 @@ void creerDossier(const std::string& path, bool demo, year_month_day today) {
     db->exec("BEGIN");
     db->exec(dictionary_sql);
     db->exec(labels_sql);
-    if (demo) {
-      // The demo's exercise is the calendar year that holds the day it is made.
-      std::string sql = demo_sql;
-      year_month_day first{today.year(), January, day(1)};
-      year_month_day last{today.year(), December, day(31)};
-      replaceAll(sql, "{{PDDEX}}", host::jourIso(first));
-      replaceAll(sql, "{{PDFEX}}", host::jourIso(last));
-      replaceAll(sql, "{{PDTCL}}", host::jourIso(last));
-      db->exec(sql);
-    }
+    if (!referenceSql.empty()) db->exec(referenceSql);
     db->exec("COMMIT");
     db->exec("PRAGMA journal_mode = WAL");
   } catch (const host::HostError& error) {

@@ -1,5 +1,6 @@
 // The `mirvae` program itself, run as a person runs it: session scripts through
-// `mirvae run` on a fresh demo dossier, the demo, and --help on every command.
+// `mirvae run` on a fresh demo dossier, the demo, a company's dossier set up without
+// SQL and its entries handed over as a FEC, and --help on every command.
 #include <gtest/gtest.h>
 #include <sqlite3.h>
 #include <signal.h>
@@ -12,6 +13,9 @@
 #include <sstream>
 
 #include "host/database.h"
+#include "app/fec_export.h"
+#include "app/script.h"
+#include "host/decimal.h"
 #include "host/text.h"
 #include "tests/support/fixture.h"
 
@@ -49,7 +53,7 @@ void writeBehind(const std::string& dossier, const std::string& sql) {
 }
 
 std::string contents(const std::string& path) {
-  std::ifstream in(path);
+  std::ifstream in(path, std::ios::binary);
   return {std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
 }
 
@@ -65,9 +69,10 @@ class MirvaeRunTest : public ::testing::Test {
     for (const auto& path : {dossier_, script_, other_})
       for (const char* suffix : {"", "-wal", "-shm"}) std::filesystem::remove(path + suffix);
   }
-  Outcome play(const std::string& text) {
+  // Plays a session script on the demo dossier, or on `dossier`.
+  Outcome play(const std::string& text, const std::string& dossier = "") {
     std::ofstream(script_) << text;
-    return mirvae("run " + quote(dossier_) + " " + quote(script_));
+    return mirvae("run " + quote(dossier.empty() ? dossier_ : dossier) + " " + quote(script_));
   }
   bool registered(const std::string& module) {
     std::istringstream names(mirvae("modules").out);
@@ -288,6 +293,252 @@ TEST_F(MirvaeRunTest, ListingAndExportWriteTheLedgerAsStoredOrNameTheValueTheyCa
     }
   }
   std::filesystem::remove(journal);
+}
+
+// A client invoice, a supplier invoice and a bank receipt, on the generic tiers a new
+// company's chart holds before its own are imported.
+const char* const kFirstOperations = R"(today 15/03/2024 10:30
+open MIRVAE-ACCES1
+press CREER
+type VLIBCP1 Clients
+expect value MIRVAE.NUMCP 411000
+line new
+type LST_MIRVAL.NUMCP 707000
+type LST_V_HT 1000
+line validate
+line new
+type LST_MIRVAL.NUMCP 706000
+type LST_V_HT 500
+line validate
+expect value V_TOT_TTC 1800.00
+answer dialog 1
+press B_VALID_DOC
+expect no error
+close
+close
+open MIRVAE-ACCES2
+press CREER
+type VLIBCP1 Fournisseurs
+line new
+type LST_MIRVAL.NUMCP 601000
+type LST_V_HT 400
+line validate
+line new
+type LST_MIRVAL.NUMCP 625100
+type LST_V_HT 100
+line validate
+expect value V_TOT_TTC 590.00
+answer dialog 1
+press B_VALID_DOC
+expect no error
+close
+close
+open MIRVAE-ACCES4
+expect value VNUMCP1 512000
+press CREER
+line new
+type LST_MIRVAL.NUMCP 411000
+type LST_V_HT 1800
+line validate
+answer dialog 1
+press B_VALID_DOC
+expect no error
+expect sql "SELECT count(*) FROM PIECE" = 3
+)";
+
+std::vector<std::vector<std::string>> fecLines(const std::string& text, char separator) {
+  std::vector<std::vector<std::string>> lines;
+  std::istringstream in(text);
+  for (std::string line; std::getline(in, line);) {
+    std::vector<std::string> fields(1);
+    for (char c : line) {
+      if (c == separator)
+        fields.emplace_back();
+      else
+        fields.back().push_back(c);
+    }
+    lines.push_back(fields);
+  }
+  return lines;
+}
+
+host::Decimal fecAmount(std::string text) {
+  std::replace(text.begin(), text.end(), ',', '.');
+  return host::Decimal::parse(text).value_or(host::Decimal(-1));
+}
+
+TEST_F(MirvaeRunTest, ACompanyDossierTakesItsFirstOperationsAndHandsThemOverAsAFec) {
+  other_ = testing_support::cheminTemporaire("mirvae-company");
+  Outcome init = mirvae("init " + quote(other_) + " --company \"Menuiserie Dupré SAS\" --exercise-start 01/01/2024");
+  ASSERT_EQ(init.status, 0) << init.out;
+  Outcome entered = play(kFirstOperations, other_);
+  ASSERT_EQ(entered.status, 0) << entered.out;
+  ASSERT_EQ(mirvae("set " + quote(other_) + " company_siren \"732 829 320\"").status, 0);
+
+  auto folder = std::filesystem::path(other_).parent_path() / ("fec-" + std::filesystem::path(other_).stem().string());
+  std::filesystem::create_directory(folder);
+  for (char separator : {'\t', '|'}) {
+    SCOPED_TRACE(separator);
+    Outcome exported = mirvae("export " + quote(other_) + " --format fec -o " + quote(folder.string()) +
+                              (separator == '|' ? " --separator '|'" : ""));
+    ASSERT_EQ(exported.status, 0) << exported.out;
+    auto lines = fecLines(contents((folder / "732829320FEC20241231.txt").string()), separator);
+    ASSERT_EQ(lines.size(), 13u);
+    EXPECT_EQ(lines[0][0], "JournalCode");
+    EXPECT_EQ(lines[0][17], "Idevise");
+    std::map<std::string, host::Decimal> balance;
+    host::Decimal debit, credit;
+    int piece = 0;
+    for (std::size_t i = 1; i < lines.size(); ++i) {
+      const auto& f = lines[i];
+      ASSERT_EQ(f.size(), 18u) << i;
+      // Pieces numbered on one sequence, each dated inside the exercise.
+      int number = std::stoi(f[2]);
+      EXPECT_TRUE(number == piece || number == piece + 1) << i;
+      piece = number;
+      EXPECT_EQ(f[3], "20240315");
+      balance[f[2]] += fecAmount(f[11]) - fecAmount(f[12]);
+      debit += fecAmount(f[11]);
+      credit += fecAmount(f[12]);
+    }
+    EXPECT_EQ(piece, 3);
+    for (const auto& [number, rest] : balance) EXPECT_TRUE(rest.isZero()) << "écriture " << number;
+    // The same totals as the ledger's.
+    EXPECT_EQ(debit.toString(2) + "/" + credit.toString(2), "4190.00/4190.00");
+    EXPECT_NE(mirvae("ledger " + quote(other_)).out.find("débit 4190.00 EUR, crédit 4190.00 EUR"), std::string::npos);
+  }
+
+  // A file that would not pass is not written: a piece out of balance, a label
+  // holding the separator.
+  struct Case {
+    const char* sql;
+    const char* separator;
+    const char* why;
+  } cases[] = {
+      {"UPDATE MOUVE SET MTDEB = '1800.01' WHERE NUMCP = '512000'", "tab", "l'écriture 3 n'est pas équilibrée"},
+      {"UPDATE MOUVE SET LIBEC = 'Remise | chèques' WHERE NUMCP = '512000'", "'|'", "contient le séparateur"},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.sql);
+    std::filesystem::remove_all(folder);
+    std::filesystem::create_directory(folder);
+    std::string copy = other_ + ".copy";
+    std::filesystem::copy_file(other_, copy, std::filesystem::copy_options::overwrite_existing);
+    writeBehind(copy, c.sql);
+    Outcome refused = mirvae("export " + quote(copy) + " --format fec --separator " + c.separator + " -o " +
+                             quote(folder.string()));
+    EXPECT_EQ(refused.status, 1);
+    EXPECT_NE(refused.out.find(c.why), std::string::npos) << refused.out;
+    EXPECT_TRUE(std::filesystem::is_empty(folder));
+    std::filesystem::remove(copy);
+  }
+  std::filesystem::remove_all(folder);
+}
+
+TEST_F(MirvaeRunTest, AnOptionOutOfRangeIsRefusedAndLeavesTheDossierAsItWas) {
+  other_ = testing_support::cheminTemporaire("mirvae-options");
+  ASSERT_EQ(mirvae("init " + quote(other_) + " --company Essai --exercise-start 01/07/2024").status, 0);
+  struct Case {
+    const char* option;
+    const char* value;
+    const char* why;  // "" when accepted
+  } cases[] = {
+      {"company_siren", "732829321", "sa clé de contrôle est fausse"},
+      {"company_siren", "73282932", "un SIREN a 9 chiffres"},
+      {"company_siren", "732829320", ""},
+      {"company_postcode", "2400", "5 chiffres"},
+      {"PDDEX", "01/07/2025", "avant son début"},
+      {"PDFEX", "31/12/2026", "au plus 24 mois"},
+      {"PDFEX", "31/02/2025", "n'est pas une date"},
+      {"PDTCL", "30/06/2024", "la date de clôture doit tomber"},
+      {"PMTVA", "X", "valeurs permises : D, E, vide"},
+      {"PMTVA", "E", ""},
+      {"PCECC", "999999", "compte inconnu"},
+      {"OPT_ANA", "2", "valeurs permises : 1 (oui), 0 (non)"},
+      {"CAPITAL", "1000", "option inconnue « CAPITAL »"},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(std::string(c.option) + " " + c.value);
+    std::string before = mirvae("show " + quote(other_)).out;
+    Outcome set = mirvae("set " + quote(other_) + " " + c.option + " " + quote(c.value));
+    EXPECT_EQ(set.status, *c.why ? 1 : 0) << set.out;
+    EXPECT_NE(set.out.find(c.why), std::string::npos) << set.out;
+    if (*c.why) {
+      EXPECT_EQ(mirvae("show " + quote(other_)).out, before);
+    }
+  }
+  std::istringstream shown(mirvae("show " + quote(other_)).out);
+  std::map<std::string, std::string> values;
+  for (std::string line; std::getline(shown, line);) {
+    std::istringstream words(line);
+    std::string option, value;
+    words >> option >> value;
+    values[option] = value;
+  }
+  EXPECT_EQ(values["company_siren"], "732829320");
+  EXPECT_EQ(values["PDDEX"], "2024-07-01");
+  EXPECT_EQ(values["PDFEX"], "2025-06-30");
+  EXPECT_EQ(values["PMTVA"], "E");
+}
+
+TEST_F(MirvaeRunTest, AnImportWritesItsWholeFileOrNothingAndKeepsAccentsOfEitherEncoding) {
+  other_ = testing_support::cheminTemporaire("mirvae-import");
+  ASSERT_EQ(mirvae("init " + quote(other_) + " --company Essai").status, 0);
+  std::string file = other_ + ".csv";
+  struct Case {
+    const char* kind;
+    std::string bytes;
+    const char* flags;
+    int status;
+    const char* reported;  // on the output, "" for nothing
+    const char* check;     // a query whose answer must be 0 afterwards
+  } cases[] = {
+      // One bad row in three: nothing written, the row named.
+      {"accounts", "compte;libelle;nature;tva\n606110;Gaz;HU;A20\n606120;Fioul;HU;A99\n606130;Bois de chauffage;HU;A20\n",
+       "", 1, "ligne 3 : code de TVA inconnu « A99 »", "SELECT count(*) FROM COMPT WHERE NUMCP IN ('606110', '606120', '606130')"},
+      // The same with --skip-bad: the sound rows are written.
+      {"accounts", "compte;libelle;nature;tva\n606110;Gaz;HU;A20\n606120;Fioul;HU;A99\n606130;Bois de chauffage;HU;A20\n",
+       "--skip-bad", 0, "ligne 3", "SELECT count(*) - 2 FROM COMPT WHERE NUMCP IN ('606110', '606120', '606130')"},
+      // Windows-1252 and commas, as a French spreadsheet saves them; a quoted field.
+      {"tiers", "compte,nom,ville\n411100,Caf\xE9 des Ar\xE8nes,P\xC9RIGUEUX\n401100,\"\x8Cuvres, b\xE2timent\",BERGERAC\n",
+       "", 0, "", "SELECT count(*) - 2 FROM COMPT WHERE LIBCP IN ('Café des Arènes', 'Œuvres, bâtiment') AND "
+                  "VILCP IN ('PÉRIGUEUX', 'BERGERAC') AND NATUC IN ('C', 'F')"},
+      // UTF-8 stays as it is.
+      {"tiers", "compte;nom;nature\n421100;Émilie Roques;A\n", "", 0, "",
+       "SELECT count(*) - 1 FROM COMPT WHERE LIBCP = 'Émilie Roques'"},
+      {"tiers", "compte;nom\n512100;Banque bis\n", "", 1, "ligne 2 : le compte 512100 n'est ni client", "SELECT 0"},
+      {"rates", "devise;date;cours\nUSD;01/01/2024;1,1050\nUSD;31/02/2024;1,2\n", "", 1,
+       "ligne 3 : « 31/02/2024 » n'est pas une date", "SELECT count(*) FROM MONNAIE_COURS"},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.bytes);
+    std::ofstream(file, std::ios::binary) << c.bytes;
+    Outcome imported = mirvae("import " + quote(other_) + " " + c.kind + " " + quote(file) + " " + c.flags);
+    EXPECT_EQ(imported.status, c.status) << imported.out;
+    EXPECT_NE(imported.out.find(c.reported), std::string::npos) << imported.out;
+    Outcome checked = play(std::string("expect sql \"") + c.check + "\" = 0\n", other_);
+    EXPECT_EQ(checked.status, 0) << checked.out;
+  }
+  std::filesystem::remove(file);
+}
+
+// The demo's entries as the tax office would receive them, kept beside this file and
+// read by a person: a change in the export shows here first. Today is fixed, so the
+// exercise and the validation dates are those of the sample.
+TEST(DemoFec, TheDemoExportsTheReviewedSample) {
+  host::clock::setToday(testing_support::jourDeTest());
+  host::clock::setTimeOfDay("10:30:00");
+  std::string path = testing_support::cheminTemporaire("mirvae-demo-fec");
+  std::ostringstream transcript;
+  ASSERT_EQ(app::demo(path, transcript), 0) << transcript.str();
+  app::FecFile file = app::exporterFec(*registry::ouvrirDossier(path), {});
+  host::clock::setToday(std::nullopt);
+  host::clock::setTimeOfDay(std::nullopt);
+  for (const char* suffix : {"", "-wal", "-shm"}) std::filesystem::remove(path + suffix);
+  auto sample = std::filesystem::path(MIRVAE_SOURCE_DIR) / "tests/e2e/demo_fec.txt";
+  if (std::getenv("MIRVAE_WRITE_SAMPLES")) std::ofstream(sample, std::ios::binary) << file.content;
+  EXPECT_EQ(file.content, contents(sample.string()));
+  EXPECT_EQ(file.name, "");
 }
 
 }  // namespace
