@@ -12,9 +12,9 @@
 #include <fstream>
 #include <sstream>
 
-#include "host/database.h"
 #include "app/fec_export.h"
 #include "app/script.h"
+#include "host/database.h"
 #include "host/decimal.h"
 #include "host/text.h"
 #include "tests/support/fixture.h"
@@ -340,6 +340,11 @@ line new
 type LST_MIRVAL.NUMCP 411000
 type LST_V_HT 1800
 line validate
+expect screen MIRVAE-GEST_JUS
+expect rows 1
+press VALID
+press VALID
+expect screen MIRVAE-GESTION4
 answer dialog 1
 press B_VALID_DOC
 expect no error
