@@ -132,7 +132,8 @@ using host::Evt;
 MIRVAEGestion6::MIRVAEGestion6(Evt* e) : EntryScreen(e, registry::operationKind(6)) {
   registerBranches(entry::branchesWithout(
       entry::kInvoiceBranches, {{"VLIBCP1", "COMPT1_CHOISIR", "LST_VLIBCP2", "COMPT2_CHOISIR"}},
-      {"COMPT_CHOISIR", "LST_VLIBCP", "LST_VLIBSENS_DC", "CALCUL_DC", "TYPLB_CHOISIR", "TESTS_VALIDATION"}));
+      {"COMPT_CHOISIR", "LST_VLIBCP", "LST_VLIBSENS_DC", "CALCUL_DC", "TYPLB_CHOISIR", "TESTS_VALIDATION",
+       "EXTRACTION_TABLE_MIRVAJUS", "SUPPRESSION_TABLE_MIRVAJUS", "VALIDATION_TABLE_MIRVAJUS"}));
 }
 
 void MIRVAEGestion6::provide(entry::Handlers& handlers) {

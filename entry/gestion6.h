@@ -88,4 +88,7 @@ class MIRVAEGestion6 : public entry::EntryScreen {
   entry::AnyAccount lineAccount_{*this};
   entry::DebitCreditTotals totals_{*this};
   entry::StandardLabels labels_{*this};
+  // The settlement rows of its lines are kept, replaced and deleted with the
+  // operation, as on bank and cash operations.
+  entry::JustificationRows justification_{*this};
 };

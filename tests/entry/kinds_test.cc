@@ -53,7 +53,8 @@ TEST_F(KindsTest, EachKindRegistersEveryBranchOnceInItsOrder) {
       {5, {}, treasury},
       {6,
        {"VLIBCP1", "COMPT1_CHOISIR", "LST_VLIBCP2", "COMPT2_CHOISIR"},
-       {"COMPT_CHOISIR", "LST_VLIBCP", "LST_VLIBSENS_DC", "CALCUL_DC", "TYPLB_CHOISIR", "TESTS_VALIDATION"}},
+       {"COMPT_CHOISIR", "LST_VLIBCP", "LST_VLIBSENS_DC", "CALCUL_DC", "TYPLB_CHOISIR", "TESTS_VALIDATION",
+        "EXTRACTION_TABLE_MIRVAJUS", "SUPPRESSION_TABLE_MIRVAJUS", "VALIDATION_TABLE_MIRVAJUS"}},
   };
   for (const auto& c : cases) {
     SCOPED_TRACE(c.kind);
