@@ -181,18 +181,53 @@ class Painter {
   int decimalsOf(const Values& record) { return decimals_(valueOf(record, layout_.currency)); }
 
   // ---- tables
-  std::vector<double> widths() const {
-    double sum = 0;
-    for (const Zone& z : layout_.columns) sum += z.width;
-    std::vector<double> out;
-    for (const Zone& z : layout_.columns) out.push_back(kContentWidth * z.width / sum);
-    return out;
+  // The width of `text` on one line.
+  double naturalWidth(const std::string& text, Font font) {
+    bool drawing = draw_;
+    draw_ = false;
+    this->text(text, 0, 0, 0, font, Align::left, false);
+    draw_ = drawing;
+    int w = 0, h = 0;
+    pango_layout_get_size(text_.get(), &w, &h);
+    return static_cast<double>(w) / PANGO_SCALE;
+  }
+
+  // Columns share the page by their widths, each at least as wide as its heading's
+  // longest word and, for a date, as a date: a heading or a date is never broken.
+  const std::vector<double>& widths() {
+    if (!widths_.empty()) return widths_;
+    std::vector<double> least;
+    for (const Zone& z : layout_.columns) {
+      double w = 0;
+      std::size_t from = 0;
+      for (std::size_t to; from <= z.title.size(); from = to + 1) {
+        to = std::min(z.title.find(' ', from), z.title.size());
+        w = std::max(w, naturalWidth(z.title.substr(from, to - from), Font::bold));
+      }
+      if (z.format == Format::date) w = std::max(w, naturalWidth("00/00/0000", Font::body));
+      least.push_back(w + 2 * kPad + 1);
+    }
+    std::vector<bool> fixed(least.size(), false);
+    widths_.assign(least.size(), 0);
+    for (bool changed = true; changed;) {
+      changed = false;
+      double room = kContentWidth, shares = 0;
+      for (std::size_t c = 0; c < least.size(); ++c) {
+        if (fixed[c]) room -= least[c];
+        else shares += layout_.columns[c].width;
+      }
+      for (std::size_t c = 0; c < least.size(); ++c) {
+        widths_[c] = fixed[c] ? least[c] : room * layout_.columns[c].width / shares;
+        if (!fixed[c] && widths_[c] < least[c]) fixed[c] = changed = true;
+      }
+    }
+    return widths_;
   }
 
   static Align alignOf(Format f) { return f == Format::amount || f == Format::rate ? Align::right : Align::left; }
 
   double row(const std::vector<std::string>& cells, Font font, bool measureOnly) {
-    std::vector<double> w = widths();
+    const std::vector<double>& w = widths();
     bool drawing = draw_;
     if (measureOnly) draw_ = false;
     double x = kMargin, h = 0;
@@ -330,6 +365,7 @@ class Painter {
   const Company& company_;
   const std::function<int(const std::string&)>& decimals_;
   std::unique_ptr<PangoLayout, Unref> text_;
+  std::vector<double> widths_;
   bool draw_ = false;
   int pages_ = 0, page_ = 0;
   double y_ = 0;
