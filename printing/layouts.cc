@@ -107,7 +107,7 @@ Layout listOf(const KindPrint& k) {
   l.columns.push_back(text("Intitulé", "VLIBCP1", 1.7));
   l.columns.push_back(text("Libellé", "MIRVAE.INPIE", 1.9));
   if (k.treasury) {
-    l.columns.push_back(text("Sens", "VTYPE_DR", 0.9));
+    l.columns.push_back(text("Sens", "VTYPE_DR", 1.1));
     l.columns.push_back(amount("HT", "VHT"));
     l.columns.push_back(amount("TVA", "VTVA"));
     l.columns.push_back(amount("TTC", "VTTC"));
