@@ -7,7 +7,7 @@
 #                                 and fuzz the script, amount and date readers for a short while
 #   ./project.sh fuzz [SECONDS]   build the fuzz target with clang and run it (default 25 s)
 #   ./project.sh build            build the normal tree only (build/)
-#   ./project.sh bench [NAME...]  build, then run the benchmarks (bench/README.md): posting, list, memory
+#   ./project.sh bench [NAME...]  build, then run the benchmarks (bench/README.md): posting, list, memory, print
 set -euo pipefail
 cd "$(dirname "$0")"
 
@@ -70,7 +70,7 @@ case "$command" in
   bench)
     build build
     names=("$@")
-    [ ${#names[@]} -gt 0 ] || names=(posting list memory)
+    [ ${#names[@]} -gt 0 ] || names=(posting list memory print)
     for name in "${names[@]}"; do
       echo "== ${name}_bench"
       ./build/bench/"${name}"_bench

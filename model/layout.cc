@@ -31,7 +31,6 @@ enum class Align { left, right, center };
 
 using Surface = std::unique_ptr<cairo_surface_t, decltype(&cairo_surface_destroy)>;
 using Context = std::unique_ptr<cairo_t, decltype(&cairo_destroy)>;
-using FontDescription = std::unique_ptr<PangoFontDescription, decltype(&pango_font_description_free)>;
 struct Unref {
   void operator()(void* object) const { g_object_unref(object); }
 };
@@ -75,6 +74,7 @@ class Painter {
   // Lays the document out; draws only when `pages` (the count of the first pass) is given.
   int run(int pages) {
     draw_ = pages > 0;
+    row_ = 0;
     pages_ = pages;
     page_ = 0;
     if (layout_.form) {
@@ -100,9 +100,8 @@ class Painter {
   // drawing.
   double text(const std::string& text, double x, double y, double width, Font font = Font::body,
               Align align = Align::left, bool wrap = true) {
-    FontDescription description(pango_font_description_from_string(fontName(font)), pango_font_description_free);
     PangoLayout* l = text_.get();
-    pango_layout_set_font_description(l, description.get());
+    pango_layout_set_font_description(l, fontOf(font));
     pango_layout_set_width(l, wrap ? static_cast<int>(width * PANGO_SCALE) : -1);
     pango_layout_set_wrap(l, PANGO_WRAP_WORD_CHAR);
     pango_layout_set_alignment(l, align == Align::right    ? PANGO_ALIGN_RIGHT
@@ -116,6 +115,12 @@ class Painter {
       pango_cairo_show_layout(cr_, l);
     }
     return static_cast<double>(h) / PANGO_SCALE;
+  }
+
+  const PangoFontDescription* fontOf(Font font) {
+    auto& slot = fonts_[static_cast<int>(font)];
+    if (!slot) slot.reset(pango_font_description_from_string(fontName(font)));
+    return slot.get();
   }
 
   void rule(double y, double width = 0.5) {
@@ -250,14 +255,21 @@ class Painter {
     rule(y_);
   }
 
-  // A row of the table; a new page repeats the headings first.
+  // A row of the table; a new page repeats the headings first. Rows are measured in
+  // the first pass; the second reuses their heights.
   void tableRow(const std::vector<std::string>& cells, Font font = Font::body) {
-    double h = row(cells, font, true);
+    double h;
+    if (draw_) {
+      h = heights_[row_++];
+    } else {
+      h = row(cells, font, true);
+      heights_.push_back(h);
+    }
     if (y_ + h > kBottom) {
       startPage();
       headings();
     }
-    row(cells, font, false);
+    if (draw_) row(cells, font, false);
     y_ += h;
   }
 
@@ -366,6 +378,12 @@ class Painter {
   const std::function<int(const std::string&)>& decimals_;
   std::unique_ptr<PangoLayout, Unref> text_;
   std::vector<double> widths_;
+  std::vector<double> heights_;  // of the table rows, measured in the first pass
+  std::size_t row_ = 0;
+  std::unique_ptr<PangoFontDescription, decltype(&pango_font_description_free)> fonts_[5] = {
+      {nullptr, pango_font_description_free}, {nullptr, pango_font_description_free},
+      {nullptr, pango_font_description_free}, {nullptr, pango_font_description_free},
+      {nullptr, pango_font_description_free}};
   bool draw_ = false;
   int pages_ = 0, page_ = 0;
   double y_ = 0;
