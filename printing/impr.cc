@@ -4,6 +4,8 @@
 
 namespace printing {
 
+using namespace host;
+
 namespace {
 
 // The accounts library reads `number` into I_CPCOMPT; `accounts`, the job's binding
