@@ -141,6 +141,23 @@ TEST_F(ImprTest, EachKindsFormNamesItsAccountAndTitlesItsLines) {
   }
 }
 
+TEST_F(ImprTest, TheCompanyPrintsWhatTheDossierHoldsOfItAndNothingElse) {
+  operation("00000251", "FC", "411001", {"706300"});
+  model::Imprimante::courante().versFichier(pdf_);
+  ASSERT_TRUE(imprimer("fiche1", model::requeteFiche("00000251")));
+  std::string bare = pdfText();
+  EXPECT_EQ(bare.find("SIREN"), std::string::npos);
+  base().exec(
+      "INSERT INTO DOSSIER_INFO (CLE, VALEUR) VALUES ('company_address', 'Rue des Ébénistes'),"
+      " ('company_town', 'PÉRIGUEUX'), ('company_siren', '123 456 789')");
+  ASSERT_TRUE(imprimer("fiche1", model::requeteFiche("00000251")));
+  EXPECT_TRUE(inOrder(pdfText(), {"Atelier Castagnède SARL", "Rue des Ébénistes", "PÉRIGUEUX", "SIREN 123 456 789",
+                                  "Brasserie Lissandre"}));
+  base().exec("INSERT INTO DOSSIER_INFO (CLE, VALEUR) VALUES ('company_postcode', '24000')");
+  ASSERT_TRUE(imprimer("fiche1", model::requeteFiche("00000251")));
+  EXPECT_NE(pdfText().find("24000 PÉRIGUEUX"), std::string::npos);
+}
+
 TEST_F(ImprTest, PostcodeAndTownAreOneTextWithOneSpaceEvenWhenOneIsEmpty) {
   operation("00000201", "FC", "411001", {"706300"});
   const struct {
