@@ -1,5 +1,7 @@
 #include "model/impression.h"
 
+#include <unistd.h>
+
 #include <cstdio>
 #include <filesystem>
 
@@ -40,7 +42,6 @@ int decimalsOf(const std::string& code) {
 
 // The first free "<name>-NNN.pdf" of the folder.
 std::string nextFile(const std::string& folder, const std::string& name) {
-  std::filesystem::create_directories(folder);
   for (int n = 1;; ++n) {
     char number[16];
     std::snprintf(number, sizeof number, "%03d", n);
@@ -91,10 +92,27 @@ void Imprimante::terminer() {
   const Layout* layout = layoutFor(document.module);
   if (!layout) throw host::HostError("le module d'impression « " + document.module + " » n'a pas de mise en page");
   host::Session& session = host::Session::courante();
-  std::string path = file_ ? *file_ : nextFile(*folder_, printName(document.module));
-  writePdf(*layout, document, companyOf(session.base()), decimalsOf, path);
-  last_file_ = path;
-  session.transcript().ajouter("impression", printName(document.module) + " : " + path);
+  // Written beside its place now, so that a failure fails the print; put in its place
+  // once the user action has committed, so that an action undone or played again
+  // leaves no print, or one, behind.
+  std::string name = printName(document.module);
+  std::filesystem::path folder = file_ ? std::filesystem::path(*file_).parent_path() : std::filesystem::path(*folder_);
+  if (!folder.empty()) std::filesystem::create_directories(folder);
+  static int scratches = 0;
+  std::string scratch =
+      (folder / ("." + name + "-" + std::to_string(::getpid()) + "-" + std::to_string(++scratches) + ".part")).string();
+  writePdf(*layout, document, companyOf(session.base()), decimalsOf, scratch);
+  std::optional<std::string> file = file_, into = folder_;
+  session.aLaFinDeLAction([this, &session, scratch, name, file, into](bool committed) {
+    if (!committed) {
+      std::filesystem::remove(scratch);
+      return;
+    }
+    std::string path = file ? *file : nextFile(*into, name);
+    std::filesystem::rename(scratch, path);
+    last_file_ = path;
+    session.transcript().ajouter("impression", name + " : " + path);
+  });
 }
 
 const Impression& Imprimante::derniere() const {

@@ -7,6 +7,7 @@
 #include <cstdio>
 #include <filesystem>
 
+#include "host/error.h"
 #include "host/registry.h"
 #include "host/session.h"
 #include "model/impression.h"
@@ -156,6 +157,28 @@ TEST_F(ImprTest, TheCompanyPrintsWhatTheDossierHoldsOfItAndNothingElse) {
   base().exec("INSERT INTO DOSSIER_INFO (CLE, VALEUR) VALUES ('company_postcode', '24000')");
   ASSERT_TRUE(imprimer("fiche1", model::requeteFiche("00000251")));
   EXPECT_NE(pdfText().find("24000 PÉRIGUEUX"), std::string::npos);
+}
+
+TEST_F(ImprTest, APrintLandsWithItsActionOnlyOneFileAPrint) {
+  operation("00000261", "FC", "411001", {"706300"});
+  const std::filesystem::path folder = pdf_ + "-impressions";
+  model::Imprimante::courante().versDossier(folder.string());
+  // Undone: the action failed after its print was made.
+  EXPECT_FALSE(session().action([&] {
+    imprimer("fiche1", model::requeteFiche("00000261"));
+    throw host::HostError("refusé après l'impression");
+  }));
+  EXPECT_TRUE(std::filesystem::is_empty(folder));
+  ASSERT_TRUE(imprimer("fiche1", model::requeteFiche("00000261")));
+  ASSERT_TRUE(imprimer("fiche1", model::requeteFiche("00000261")));
+  std::vector<std::string> files;
+  for (const auto& entry : std::filesystem::directory_iterator(folder)) files.push_back(entry.path().filename());
+  std::sort(files.begin(), files.end());
+  EXPECT_EQ(files, (std::vector<std::string>{"fiche1-001.pdf", "fiche1-002.pdf"}));
+  EXPECT_EQ(session().transcript().textes("impression"),
+            (std::vector<std::string>{"fiche1 : " + (folder / "fiche1-001.pdf").string(),
+                                      "fiche1 : " + (folder / "fiche1-002.pdf").string()}));
+  std::filesystem::remove_all(folder);
 }
 
 TEST_F(ImprTest, PostcodeAndTownAreOneTextWithOneSpaceEvenWhenOneIsEmpty) {
