@@ -44,7 +44,9 @@ class Imprimante {
   void entete(Values heading);
   void ecrire(std::string ligne, Block block);
   // The job ended. With a destination, the document is laid out with its module's
-  // layout and written; the session's transcript then names the file ("impression").
+  // layout and written beside its place; once the user action has committed it is put
+  // in place and the session's transcript names the file ("impression"). Throws
+  // HostError when the module has no layout or the file cannot be written.
   void terminer();
 
   const std::vector<Impression>& impressions() const { return printed_; }
