@@ -7,12 +7,13 @@
 #                                 and fuzz the script, amount and date readers for a short while
 #   ./project.sh fuzz [SECONDS]   build the fuzz target with clang and run it (default 25 s)
 #   ./project.sh build            build the normal tree only (build/)
-#   ./project.sh bench [NAME...]  build, then run the benchmarks (bench/README.md): posting, list, memory, action
+#   ./project.sh bench [NAME...]  build, then run the benchmarks (bench/README.md): posting, list, memory, action, print
 set -euo pipefail
 cd "$(dirname "$0")"
 
 packages=(build-essential cmake ninja-build pkg-config libsqlite3-dev sqlite3 libboost-dev libcli11-dev
-          libgtest-dev libgmock-dev libbenchmark-dev hledger clang libclang-rt-14-dev)
+          libgtest-dev libgmock-dev libbenchmark-dev hledger clang libclang-rt-14-dev
+          libcairo2-dev libpango1.0-dev fonts-dejavu-core poppler-utils)
 
 install_missing() {
   local missing=()
@@ -69,7 +70,7 @@ case "$command" in
   bench)
     build build
     names=("$@")
-    [ ${#names[@]} -gt 0 ] || names=(posting list memory action)
+    [ ${#names[@]} -gt 0 ] || names=(posting list memory action print)
     for name in "${names[@]}"; do
       echo "== ${name}_bench"
       ./build/bench/"${name}"_bench

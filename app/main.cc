@@ -8,6 +8,7 @@
 
 #include "app/dossier_commands.h"
 #include "app/exports.h"
+#include "app/print.h"
 #include "app/script.h"
 #include "host/clock.h"
 #include "host/error.h"
@@ -43,6 +44,16 @@ int main(int argc, char** argv) {
   exportCommand->add_option("-o,--output", output, "Fichier de sortie (sinon la sortie standard)");
 
   app::DossierCommands dossierCommands(program, *init, *exportCommand);
+  app::PrintRequest print;
+  CLI::App* printCommand = program.add_subcommand("print", "Imprime une opération (fiche1 à fiche6) ou une liste (liste1 à liste6) en PDF");
+  printCommand->add_option("DOSSIER", print.dossier, "Dossier")->required()->check(CLI::ExistingFile);
+  printCommand->add_option("IMPRESSION", print.print, "fiche1 ... fiche6, liste1 ... liste6")->required();
+  printCommand->add_option("IDENT", print.ident, "Identifiant de l'opération (fiche)");
+  printCommand->add_option("--from", print.from, "Liste : date de début (JJ/MM/AAAA)");
+  printCommand->add_option("--to", print.to, "Liste : date de fin (JJ/MM/AAAA)");
+  printCommand->add_option("--account", print.account, "Liste : numéro de compte");
+  printCommand->add_option("--direction", print.direction, "Liste de banque ou de caisse : D dépenses, R recettes");
+  printCommand->add_option("-o,--output", print.output, "Fichier PDF (sinon le dossier d'impressions du dossier)");
 
   CLI11_PARSE(program, argc, argv);
 
@@ -56,6 +67,10 @@ int main(int argc, char** argv) {
     }
     if (program.got_subcommand("modules")) {
       for (const auto& name : host::Registre::instance().modules()) std::cout << name << "\n";
+      return 0;
+    }
+    if (printCommand->parsed()) {
+      std::cout << "Impression : " << app::imprimer(print) << "\n";
       return 0;
     }
     if (run->parsed()) return app::jouerFichier(dossier, script, std::cout);

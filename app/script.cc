@@ -11,6 +11,7 @@
 #include "host/clock.h"
 #include "host/error.h"
 #include "host/session.h"
+#include "model/impression.h"
 #include "registry/dossier.h"
 #include "registry/library.h"
 #include "services/services.h"
@@ -19,15 +20,15 @@ extern const char* const demo_script;
 
 namespace app {
 
-namespace {
-
-// Who acts in the session: the person running the program.
 std::string userName() {
   const char* user = std::getenv("USER");
   return user && *user ? user : "mirvae";
 }
 
-}  // namespace
+std::string dossierImpressions(const std::string& dossier) {
+  std::filesystem::path path(dossier);
+  return (path.parent_path() / (path.stem().string() + "-impressions")).string();
+}
 
 void chargerModules() {
   registry::chargerBibliotheque();
@@ -51,6 +52,8 @@ int jouer(const std::string& dossier, std::istream& script, const std::string& s
   }
   ScriptPlayer player(std::move(lines), out);
   host::Session session(registry::ouvrirDossier(dossier), player, userName());
+  model::DestinationGuard printing;
+  model::Imprimante::courante().versDossier(dossierImpressions(dossier));
   try {
     player.play(session);
   } catch (const ScriptError& e) {

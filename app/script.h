@@ -12,6 +12,13 @@ namespace app {
 // once per process.
 void chargerModules();
 
+// Who acts in a session: the person running the program.
+std::string userName();
+
+// Where a session on `dossier` prints: the folder "NAME-impressions" beside the
+// dossier file "NAME.db", one PDF file a print.
+std::string dossierImpressions(const std::string& dossier);
+
 // Plays the script in `script` on the dossier, printing the transcript to `out` as
 // it grows. Returns 0 when every line was understood and every expectation held,
 // 1 otherwise, the failing line named on `out` ("script.txt:12: ..."). Throws

@@ -26,6 +26,20 @@ Decimal scaled(const Decimal& amount, const Decimal& fromRate, const Decimal& to
 
 std::string amountText(const Decimal& amount, int decimals) { return amount.toFixed(decimals); }
 
+std::string frenchAmountText(const Decimal& amount, int decimals) {
+  std::string plain = amountText(amount, decimals);
+  std::size_t digits = plain[0] == '-' ? 1 : 0;
+  std::size_t point = plain.find('.');
+  std::size_t end = point == std::string::npos ? plain.size() : point;
+  std::string out = plain.substr(0, digits);
+  for (std::size_t i = digits; i < end; ++i) {
+    if (i > digits && (end - i) % 3 == 0) out += ' ';
+    out += plain[i];
+  }
+  if (point != std::string::npos) out += "," + plain.substr(point + 1);
+  return out;
+}
+
 Decimal typedAmount(std::string_view text, int decimals, std::string_view what) {
   Decimal amount = Valeur::depuisTexte(Genre::Monnaie, text, what).decimal();
   Decimal limit(1);

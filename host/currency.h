@@ -36,6 +36,9 @@ constexpr int kAmountMaxIntegerDigits = 15;
 // The amount as people see it: exactly `decimals` decimals, rounded to the nearest,
 // ties away from zero (JPY "1500", EUR "1500.00").
 std::string amountText(const Decimal& amount, int decimals);
+// The same amount as a French reader writes it on paper: thousands apart by a blank,
+// a decimal comma ("-1 234,50").
+std::string frenchAmountText(const Decimal& amount, int decimals);
 // The amount a person typed, as the screen then holds and shows it: rounded to
 // `decimals` like amountText, so that what is kept is what was seen. An empty text
 // is 0. HostError naming `what` for a text that is not an amount, and for one with

@@ -221,6 +221,7 @@ bool Session::action(const std::function<void()>& act) {
     if (!again && !failed_) {
       try {
         db_->commit();
+        endAttempt(true);
         break;
       } catch (const Database::NonGarde& e) {
         signalerErreur("", e.what());
@@ -230,6 +231,7 @@ bool Session::action(const std::function<void()>& act) {
       }
     }
     db_->rollback();
+    endAttempt(false);
     undo(attempt, again);
     if (!again) break;
     if (pending_) {
@@ -256,6 +258,25 @@ bool Session::action(const std::function<void()>& act) {
   transcript_.rejouer({});
   fermerTermines();
   return !failed_;
+}
+
+void Session::aLaFinDeLAction(std::function<void(bool committed)> done) {
+  if (action_depth_ == 0)
+    done(true);
+  else
+    at_end_.push_back(std::move(done));
+}
+
+void Session::endAttempt(bool committed) {
+  std::vector<std::function<void(bool)>> done = std::move(at_end_);
+  at_end_.clear();
+  for (auto& d : done) {
+    try {
+      d(committed);
+    } catch (const std::exception& e) {
+      signalerErreur("", e.what());
+    }
+  }
 }
 
 void Session::dansUnite(const std::function<void()>& act) {

@@ -165,6 +165,11 @@ class Session {
   void dansUnite(const std::function<void()>& act);
   void signalerErreur(const std::string& event, const std::string& message);
   bool actionEchouee() const { return failed_; }
+  // Work that must land with the user action under way, not with one of its attempts
+  // (a file written for the user): `done(true)` runs once the action has committed,
+  // `done(false)` when its attempt is rolled back (and the action perhaps played
+  // again). Outside an action, `done(true)` runs at once.
+  void aLaFinDeLAction(std::function<void(bool committed)> done);
 
   // ---- screens and modules
   // Opens a module beside its caller and returns at once.
@@ -215,6 +220,7 @@ class Session {
   void forgetQueued(Automate* automate);
   void close(Automate* automate, bool silent = false);
   void keep(Attempt& attempt);
+  void endAttempt(bool committed);
   void undo(Attempt& attempt, bool silent);
   // The answer of the journal for this question, when the action played again has
   // come to it.
@@ -236,6 +242,7 @@ class Session {
   std::vector<Answered> journal_;
   std::size_t journal_at_ = 0;
   std::function<void()> pending_;  // a question to ask once the unit is rolled back
+  std::vector<std::function<void(bool)>> at_end_;  // of the attempt under way
   Session* previous_;
   std::shared_ptr<Devises> devises_;
 };

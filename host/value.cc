@@ -365,6 +365,15 @@ long Date::finMois(long day) {
 
 Valeur Date::dJour(long day) { return Valeur::date(year_month_day{sys_days(days(day))}); }
 
+std::string Date::eDate(std::string_view text, std::string_view separator) {
+  year_month_day d{sys_days(days(jDate(text)))};
+  char out[32];
+  std::snprintf(out, sizeof out, "%02u%.*s%02u%.*s%04d", static_cast<unsigned>(d.day()),
+                static_cast<int>(separator.size()), separator.data(), static_cast<unsigned>(d.month()),
+                static_cast<int>(separator.size()), separator.data(), static_cast<int>(d.year()));
+  return out;
+}
+
 long Date::eDate() const {
   Jour day = jour();
   if (!day) throw HostError("la date " + nom() + " est vide");

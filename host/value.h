@@ -200,6 +200,10 @@ HOST_VALUE_TYPE(Date, Genre::Date)
   static long jDate(std::string_view text);
   static long finMois(long day);  // the last day of that day's month
   static Valeur dJour(long day);  // the date of a day number
+  // A date text (ISO, as requests write dates, or DD/MM/YYYY) written day, month and
+  // year apart by `separator` ("2024-03-01", "/" gives "01/03/2024"). Throws
+  // HostError when the text is not a date.
+  static std::string eDate(std::string_view text, std::string_view separator);
   long eDate() const;             // this date's day number; throws when empty
   static Valeur dateCourante();   // today, from the host clock
   static std::string heureCourante();

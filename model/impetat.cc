@@ -92,6 +92,7 @@ void Impetat::demarrer() {
     sortir(nullptr, 0);
     return;
   }
+  Imprimante::courante().entete(variableValues());
   Table& main = *table(false);
   std::string key = firstKey(main);
   // The keys first: handlers read other tables while each record prints.
@@ -119,25 +120,26 @@ void Impetat::demarrer() {
     printRecord();
     if (stopped(*this)) break;
   }
+  Imprimante::courante().terminer();
   sortir(nullptr, 0);
 }
 
 void Impetat::printRecord() {
   Table& main = *table(false);
   if (step(*this, "DEBUT_FICHE") == Outcome::stopped) return;
-  auto body = [this](const std::string& key) {
+  Table* lines = lineBinding(*this);
+  auto body = [this, lines](const std::string& key) {
     for (const char* event : {"LST_DEBUT_FICHE", "LST_DEBUT1_IMPRIME", "LST_CORPS_IMPRIME"})
       if (step(*this, event) == Outcome::stopped) return false;
-    Imprimante::courante().ecrire(describe("ligne", key));
+    print("ligne", key, lines);
     return true;
   };
   std::string ident = main.valeur(firstKey(main)).chaine();
-  Table* lines = lineBinding(*this);
   if (!lines) {
     body(ident);
     return;
   }
-  Imprimante::courante().ecrire(describe("fiche", ident));
+  print("fiche", ident, nullptr);
   Champ link("NUMERO", lines);
   lines->initRequete();
   lines->ajouteFiltre(link, '/', ident + "|");
@@ -146,11 +148,23 @@ void Impetat::printRecord() {
     if (!body(lines->valeur("NUMERO").chaine())) return;
 }
 
-std::string Impetat::describe(const std::string& kind, const std::string& key) {
-  std::string text = kind + " " + key;
+Values Impetat::variableValues() const {
+  Values values;
   for (const Donnee* d : variables())
-    if (d->acces() == 0) text += " | " + d->nom() + "=" + d->chaine();
-  return text;
+    if (d->acces() == 0) values.emplace_back(d->nom(), d->chaine());
+  return values;
+}
+
+void Impetat::print(const std::string& kind, const std::string& key, Table* lines) {
+  Block block{.kind = kind, .key = key, .values = variableValues()};
+  std::string text = kind + " " + key;
+  for (const auto& [name, value] : block.values) text += " | " + name + "=" + value;
+  for (Table* t : {table(false), lines}) {
+    if (!t) continue;
+    const std::vector<Colonne>& columns = t->colonnes();
+    for (const Colonne& c : columns) block.values.emplace_back(t->nom() + "." + c.name, t->valeur(c.name).chaine());
+  }
+  Imprimante::courante().ecrire(std::move(text), std::move(block));
 }
 
 void Edition_etat2::debut(Evt*) {}

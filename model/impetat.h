@@ -12,10 +12,12 @@
 //      "LST_DEBUT1_IMPRIME" and "LST_CORPS_IMPRIME" run;
 //   3. the end.
 // The job writes to the printer (model/impression.h) one document, under its
-// module's name and request: per record with lines a line "fiche", and per body
-// row a line "ligne", each with the row's key (IDENT, or the line's NUMERO) and the
-// job's variables as the handlers left them ("NAME=value", separated by " | "),
-// which is what a layout prints.
+// module's name and request: the variables once "DEBUT" ran (a list's heading), per
+// record with lines a block "fiche", and per body row a block "ligne", each with
+// the row's key (IDENT, or the line's NUMERO), the job's variables as the handlers
+// left them and the fields of the record (and of the line), which is what a layout
+// prints. The text line of a block holds its kind, key and variables ("NAME=value",
+// separated by " | "). Once the records are printed the printer ends the document.
 //
 // The request is run as it is given, once checked to be a single statement that
 // only reads; "TABLE" in it (the form requests say "Select * From TABLE Where
@@ -24,6 +26,7 @@
 
 #include <string>
 
+#include "model/impression.h"
 #include "model/traitmnt.h"
 
 namespace model {
@@ -45,7 +48,9 @@ class Impetat : public Traitmnt {
 
  private:
   void printRecord();
-  std::string describe(const std::string& kind, const std::string& key);
+  Values variableValues() const;
+  // Writes a block, with the fields of the main table and of `lines` when given.
+  void print(const std::string& kind, const std::string& key, Table* lines);
 
   std::string request_;
 };

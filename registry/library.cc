@@ -16,7 +16,9 @@
 #include "posting/creer_piece_od.h"
 #include "posting/supprimer_piece.h"
 #include "posting/verifier_modif_piece.h"
+#include "printing/impr.h"
 #include "printing/interface.h"
+#include "printing/layouts.h"
 
 namespace registry {
 
@@ -107,6 +109,21 @@ void declarerUnites() {
   static const Module gestJus("Justification Règlement", "MIRVAE-GEST_JUS",
                               &host::fabriquer<justification::MIRVAEGest_jus>, false, "");
   static const Source gestJusSource("MIRVAE", nullptr);
+  // Unit IMPR: the form prints, then the list prints.
+  static const Global imprGlobal("MIRVAE", "MIRVAE");
+  static const Module imprFiche1("", "MIRVAE-IMPR_FICHE1", &host::fabriquer<printing::MIRVAEImpr_fiche1>, false, "");
+  static const Module imprFiche2("", "MIRVAE-IMPR_FICHE2", &host::fabriquer<printing::MIRVAEImpr_fiche2>, false, "");
+  static const Module imprFiche3("", "MIRVAE-IMPR_FICHE3", &host::fabriquer<printing::MIRVAEImpr_fiche3>, false, "");
+  static const Module imprFiche4("", "MIRVAE-IMPR_FICHE4", &host::fabriquer<printing::MIRVAEImpr_fiche4>, false, "");
+  static const Module imprFiche5("", "MIRVAE-IMPR_FICHE5", &host::fabriquer<printing::MIRVAEImpr_fiche5>, false, "");
+  static const Module imprFiche6("", "MIRVAE-IMPR_FICHE6", &host::fabriquer<printing::MIRVAEImpr_fiche6>, false, "");
+  static const Module imprListe1("", "MIRVAE-IMPR_LISTE1", &host::fabriquer<printing::MIRVAEImpr_liste1>, false, "");
+  static const Module imprListe2("", "MIRVAE-IMPR_LISTE2", &host::fabriquer<printing::MIRVAEImpr_liste2>, false, "");
+  static const Module imprListe3("", "MIRVAE-IMPR_LISTE3", &host::fabriquer<printing::MIRVAEImpr_liste3>, false, "");
+  static const Module imprListe4("", "MIRVAE-IMPR_LISTE4", &host::fabriquer<printing::MIRVAEImpr_liste4>, false, "");
+  static const Module imprListe5("", "MIRVAE-IMPR_LISTE5", &host::fabriquer<printing::MIRVAEImpr_liste5>, false, "");
+  static const Module imprListe6("", "MIRVAE-IMPR_LISTE6", &host::fabriquer<printing::MIRVAEImpr_liste6>, false, "");
+  static const Source imprSource("MIRVAE", nullptr);
 
   // Unit INTERFACE: it also works with the globals of the general-ledger library.
   static const Global interfaceComptaGlobal("COMPTA", "MIRVAE");
@@ -124,6 +141,8 @@ void chargerBibliotheque() {
   // The crash flag of the access screens' model; the library itself never reads it.
   [[maybe_unused]] static host::Chaine crashFlag("$$|VCODECRASHFLAG", "", "", 2, "CRASHFLAG", nullptr);
   declarerUnites();
+  // The layouts of its prints, which the printer looks up by print job.
+  printing::registerLayouts();
 }
 
 }  // namespace registry

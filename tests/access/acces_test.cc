@@ -542,6 +542,10 @@ TEST_F(RegistreTest, UnitsDeclareInLoadOrder) {
       "Global MIRVAE", "Module MIRVAE-CREER_PIECE_OD", "Module MIRVAE-GESTION6", "Source MIRVAE",
       "Global MIRVAE", "Module MIRVAE-GEST_ANA", "Source MIRVAE",
       "Module MIRVAE-GEST_JUS", "Source MIRVAE",
+      "Global MIRVAE", "Module MIRVAE-IMPR_FICHE1", "Module MIRVAE-IMPR_FICHE2", "Module MIRVAE-IMPR_FICHE3",
+      "Module MIRVAE-IMPR_FICHE4", "Module MIRVAE-IMPR_FICHE5", "Module MIRVAE-IMPR_FICHE6",
+      "Module MIRVAE-IMPR_LISTE1", "Module MIRVAE-IMPR_LISTE2", "Module MIRVAE-IMPR_LISTE3",
+      "Module MIRVAE-IMPR_LISTE4", "Module MIRVAE-IMPR_LISTE5", "Module MIRVAE-IMPR_LISTE6", "Source MIRVAE",
       "Global COMPTA", "Global MIRVAE", "Module MIRVAE-INTERFACE", "Source MIRVAE"};
   // Modules the tests stand in for, when the library has not built them yet, come
   // after the library's own declarations.

@@ -546,4 +546,67 @@ TEST(DemoFec, TheDemoExportsTheReviewedSample) {
   EXPECT_EQ(file.name, "");
 }
 
+TEST_F(MirvaeRunTest, PrintWritesTheFormOrTheListAsAPdfFileAndNamesIt) {
+  writeBehind(dossier_,
+              "INSERT INTO MIRVAE (IDENT, TYPE, DTOPE, NUMCP, NPIEC, INPIE, MONNAIE_IDENT, HT, TVA, TTC) VALUES "
+              "('00000901', 'FC', date('now'), '411001', 'VT901', 'Facture client n° VT901', 'EUR', '1234.56', "
+              "'246.91', '1481.47');"
+              "INSERT INTO MIRVAL (IDENT, NUMERO, NUMCP, TXTVA, HT, TVA, TTC) VALUES "
+              "('00000902', '00000901|000001', '706300', 20, '1234.56', '246.91', '1481.47');"
+              "INSERT INTO MIRVAE (IDENT, TYPE, DTOPE, NUMCP, NPIEC, INPIE, MONNAIE_IDENT, HT, TVA, TTC, TYPE_DR) "
+              "VALUES ('00000903', 'BQ', '2024-03-05', '512100', 'BQ903', 'Frais de tenue', 'EUR', '12.5', '0', "
+              "'12.5', 'D');");
+  other_ = testing_support::cheminTemporaire("mirvae-print") + ".pdf";
+  const std::string folder = std::filesystem::path(dossier_).replace_extension("").string() + "-impressions";
+  const struct {
+    std::string args;
+    int status;
+    std::string said;                // in what the program printed
+    std::vector<std::string> text;   // in the PDF file, in order
+  } cases[] = {
+      {"fiche1 00000901 -o " + quote(other_), 0, "Impression : " + other_,
+       {"Facture client", "VT901", "Brasserie Lissandre", "706300", "1 234,56", "20 %", "Total TTC", "1 481,47"}},
+      {"liste1 --to 31/12/2099 -o " + quote(other_), 0, "Impression : " + other_,
+       {"Factures clients", "Du", "...", "Au", "31/12/2099", "VT901", "1 481,47"}},
+      {"liste4 --from 2024-03-01 --account 512100 --direction D -o " + quote(other_), 0, "Impression : ",
+       {"Du", "01/03/2024", "31/12/9999", "512100", "Banque compte courant", "Sens", "D", "Dépense", "-12,50"}},
+      {"fiche1 00000901", 0, "Impression : " + folder + "/fiche1-001.pdf", {}},
+      {"fiche2 00000901", 1, "aucune opération « 00000901 » de ce type (FF)", {}},
+      {"fiche1", 1, "donner son IDENT", {}},
+      {"liste7", 1, "impression « liste7 » inconnue", {}},
+      {"liste1 --direction D", 1, "seules les listes de banque et de caisse ont un sens", {}},
+      {"liste1 --from 31/02/2024", 1, "--from", {}},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.args);
+    std::filesystem::remove(other_);
+    Outcome printed = mirvae("print " + quote(dossier_) + " " + c.args);
+    EXPECT_EQ(printed.status, c.status) << printed.out;
+    EXPECT_NE(printed.out.find(c.said), std::string::npos) << printed.out;
+    if (c.text.empty()) continue;
+    std::string text = run("pdftotext -layout " + quote(other_) + " -").out;
+    std::size_t at = 0;
+    for (const std::string& wanted : c.text) {
+      std::size_t found = text.find(wanted, at);
+      EXPECT_NE(found, std::string::npos) << wanted << " in\n" << text;
+      if (found != std::string::npos) at = found + wanted.size();
+    }
+  }
+  EXPECT_TRUE(std::filesystem::exists(folder + "/fiche1-001.pdf"));
+
+  // From the screens, the print goes to the dossier's print folder and the transcript names it.
+  Outcome session = play(
+      "open MIRVAE-ACCES1\n"
+      "select 1\n"
+      "press IMPR_FICHE\n"
+      "expect no error\n"
+      "press IMPR_LISTE\n"
+      "expect no error\n");
+  EXPECT_EQ(session.status, 0) << session.out;
+  EXPECT_NE(session.out.find("[impression] fiche1 : " + folder + "/fiche1-002.pdf"), std::string::npos) << session.out;
+  EXPECT_NE(session.out.find("[impression] liste1 : " + folder + "/liste1-001.pdf"), std::string::npos) << session.out;
+  EXPECT_TRUE(std::filesystem::exists(folder + "/liste1-001.pdf"));
+  std::filesystem::remove_all(folder);
+}
+
 }  // namespace

@@ -10,7 +10,6 @@
 
 #include "host/error.h"
 #include "host/registry.h"
-#include "model/impetat.h"
 #include "model/impression.h"
 #include "services/cppiece.h"
 #include "tests/entry/gestion1_fixture.h"
@@ -149,14 +148,7 @@ TEST_F(DocumentTest, SavingAndCreatingANewPieceKeepsTheEntryModel) {
   EXPECT_EQ(valeur("V_CMODEL"), "VTPOSE");
 }
 
-// The client invoice form is printed by a job of the tests' own until the real one
-// is part of the library: one printed line per saved operation.
-struct FormeFacture : model::Edition_etat2 {
-  explicit FormeFacture(host::Evt* e) : Edition_etat2(e) { nomTable("MIRVAE", nullptr); }
-};
-
 TEST_F(DocumentTest, SavingAndPrintingPrintsTheFormOfTheSavedOperation) {
-  testing_support::moduleDeTest<FormeFacture>("MIRVAE-IMPR_FICHE1");
   model::Imprimante::courante().vider();
   ASSERT_TRUE(facture());
   enregistrer("3");

@@ -17,6 +17,17 @@ std::string txt(const Decimal& d) { return d.toString(0); }
 
 using CurrencyTest = testing_support::DossierTest;
 
+TEST(AmountText, FrenchFormGroupsThousandsAndKeepsTheCurrencysDecimals) {
+  const struct {
+    const char* amount;
+    int decimals;
+    const char* shown;
+  } cases[] = {{"0", 2, "0,00"},          {"999.5", 2, "999,50"},          {"1234.565", 2, "1 234,57"},
+               {"-1234567.8", 2, "-1 234 567,80"}, {"-100", 2, "-100,00"}, {"1500", 0, "1 500"},
+               {"123456.7891", 3, "123 456,789"}};
+  for (const auto& c : cases) EXPECT_EQ(frenchAmountText(dec(c.amount), c.decimals), c.shown) << c.amount;
+}
+
 TEST_F(CurrencyTest, RateIsTheLatestOnOrBeforeTheDay) {
   struct Case {
     const char* ident;

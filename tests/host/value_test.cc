@@ -18,6 +18,9 @@ TEST(Date, EndOfMonthAndTextForms) {
     d = text;
     EXPECT_EQ(d.chaine(), "29/02/2024") << text;
   }
+  EXPECT_EQ(Date::eDate("2024-03-01", "/"), "01/03/2024");
+  EXPECT_EQ(Date::eDate("2024-03-01", "."), "01.03.2024");
+  EXPECT_THROW(Date::eDate("2024-02-30", "/"), HostError);
 }
 
 TEST(Date, EmptyDateIsEmptyAndComesFirst) {
