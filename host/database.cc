@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <cstdlib>
 #include <cstring>
+#include <algorithm>
 #include <filesystem>
 
 #include "host/error.h"
@@ -258,7 +259,7 @@ std::unique_ptr<Database> Database::creer(const std::string& path) {
   return result;
 }
 
-std::unique_ptr<Database> Database::ouvrir(const std::string& path) {
+std::unique_ptr<Database> Database::ouvrir(const std::string& path, const std::vector<MiseANiveau>& upgrades) {
   if (!std::filesystem::exists(path)) throw HostError("dossier « " + path + " » introuvable");
   if (!std::filesystem::is_regular_file(path)) throw HostError("« " + path + " » n'est pas un dossier");
   sqlite3* db = openFile(path, SQLITE_OPEN_READWRITE);
@@ -282,13 +283,30 @@ std::unique_ptr<Database> Database::ouvrir(const std::string& path) {
     unusable(path, db, code);
   }
   query.reset();
-  if (version != kSchemaVersion)
-    throw HostError("le dossier « " + path + " » est de la version " + (version.empty() ? "?" : version) +
-                    " du schéma ; ce programme lit la version " + kSchemaVersion);
   if (sqlite3_exec(db, "PRAGMA journal_mode = WAL; PRAGMA synchronous = NORMAL", nullptr, nullptr, nullptr) !=
       SQLITE_OK)
     unusable(path, db, sqlite3_extended_errcode(db));
-  return result;
+  for (;;) {
+    if (version == kSchemaVersion) return result;
+    auto step = std::find_if(upgrades.begin(), upgrades.end(), [&](const MiseANiveau& u) { return u.from == version; });
+    if (step == upgrades.end())
+      throw HostError("le dossier « " + path + " » est de la version " + (version.empty() ? "?" : version) +
+                      " du schéma ; ce programme lit la version " + kSchemaVersion);
+    try {
+      result->begin();
+      result->exec(step->sql);
+      Statement& mark = result->prepare("UPDATE DOSSIER_INFO SET VALEUR = ? WHERE CLE = 'schema_version'");
+      mark.bind(1, step->to);
+      mark.step();
+      mark.reset();
+      result->commit();
+    } catch (const HostError& e) {
+      result->rollback();
+      throw HostError("le dossier « " + path + " » n'a pu être mis à la version " + step->to + " du schéma : " +
+                      e.what());
+    }
+    version = step->to;
+  }
 }
 
 Database::~Database() {

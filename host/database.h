@@ -68,14 +68,21 @@ class Statement {
 
 class Database {
  public:
-  static constexpr const char* kSchemaVersion = "1";
+  static constexpr const char* kSchemaVersion = "2";
 
   // Opens an existing dossier for reading and writing. Throws HostError saying what
   // happened: the file is missing, is not a dossier, has another schema version, is
   // locked by another process beyond the wait of a unit of work, cannot be written
   // (read-only file or file system, rights) or the disk is full. The file is not
   // changed on failure.
-  static std::unique_ptr<Database> ouvrir(const std::string& path);
+  //
+  // A dossier of an earlier schema version is brought to this one by `upgrades`, each
+  // from one version to the next, in one transaction with its version number; one
+  // that no step reaches, or of a later version, is refused.
+  struct MiseANiveau {
+    std::string from, to, sql;
+  };
+  static std::unique_ptr<Database> ouvrir(const std::string& path, const std::vector<MiseANiveau>& upgrades = {});
   // Opens or creates a plain database file (used to make a dossier, and in tests).
   static std::unique_ptr<Database> creer(const std::string& path);
   ~Database();

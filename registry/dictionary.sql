@@ -638,4 +638,4 @@ CREATE TABLE "DOSSIER_INFO" (
   PRIMARY KEY ("CLE")
 );
 
-INSERT INTO "DOSSIER_INFO" ("CLE", "VALEUR") VALUES ('schema_version', '1');
+INSERT INTO "DOSSIER_INFO" ("CLE", "VALEUR") VALUES ('schema_version', '2');

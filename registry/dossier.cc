@@ -89,6 +89,19 @@ void creerDossier(const std::string& path, std::string_view referenceSql) {
   }
 }
 
-std::unique_ptr<host::Database> ouvrirDossier(const std::string& path) { return host::Database::ouvrir(path); }
+// What each schema version added to the one before, for the dossiers made by an
+// earlier program.
+const std::vector<host::Database::MiseANiveau> kUpgrades = {
+    {"1", "2",
+     // Settlement: the lettering day of a movement and the lettering group of a due
+     // date; browsers limited to one account read it through an index.
+     R"(ALTER TABLE "MOUVE" ADD COLUMN "DTLET" DATE TEXT NOT NULL DEFAULT '';
+        ALTER TABLE "ECHEA" ADD COLUMN "RELET" TEXT NOT NULL DEFAULT '';
+        CREATE INDEX IF NOT EXISTS "MIRVAE_COMPTE" ON "MIRVAE" ("TYPE", "NUMCP", "DTOPE", "NPIEC", "IDENT");)"},
+};
+
+std::unique_ptr<host::Database> ouvrirDossier(const std::string& path) {
+  return host::Database::ouvrir(path, kUpgrades);
+}
 
 }  // namespace registry

@@ -91,7 +91,7 @@ TEST_F(OpeningTest, AFileThatIsNotADossierOfThisVersionIsNamedSo) {
          std::filesystem::copy_file(dossier_, p);
          Database::creer(p)->exec("UPDATE DOSSIER_INFO SET VALEUR = '7' WHERE CLE = 'schema_version'");
        },
-       "le dossier « " + other_ + " » est de la version 7 du schéma ; ce programme lit la version 1"},
+       "le dossier « " + other_ + " » est de la version 7 du schéma ; ce programme lit la version 2"},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.name);
@@ -100,6 +100,29 @@ TEST_F(OpeningTest, AFileThatIsNotADossierOfThisVersionIsNamedSo) {
     EXPECT_EQ(opening(other_), c.said);
   }
   EXPECT_EQ(opening(dossier_), "ouvert");
+}
+
+// A dossier made by the program before the last schema change is brought up to date
+// when it is opened, and keeps its operations.
+TEST_F(OpeningTest, ADossierOfThePreviousSchemaIsBroughtUpToDate) {
+  Database::creer(dossier_)->exec(
+      "INSERT INTO MIRVAE (IDENT, TYPE) VALUES ('00000001', 'FC'); ALTER TABLE MOUVE DROP COLUMN DTLET; "
+      "ALTER TABLE ECHEA DROP COLUMN RELET; DROP INDEX MIRVAE_COMPTE; "
+      "UPDATE DOSSIER_INFO SET VALEUR = '1' WHERE CLE = 'schema_version'");
+  EXPECT_EQ(opening(dossier_), "le dossier « " + dossier_ + " » est de la version 1 du schéma ; ce programme lit la version 2");
+  auto db = registry::ouvrirDossier(dossier_);
+  const std::pair<const char*, const char*> after[] = {
+      {"SELECT VALEUR FROM DOSSIER_INFO WHERE CLE = 'schema_version'", "2"},
+      {"SELECT count(DTLET) FROM MOUVE", "0"},
+      {"SELECT count(RELET) FROM ECHEA", "0"},
+      {"SELECT IDENT FROM MIRVAE INDEXED BY MIRVAE_COMPTE WHERE TYPE = 'FC'", "00000001"},
+  };
+  for (const auto& [query, expected] : after) {
+    host::Statement& s = db->prepare(query);
+    EXPECT_TRUE(s.step()) << query;
+    EXPECT_EQ(s.text(0), expected) << query;
+    s.reset();
+  }
 }
 
 // Waits the ten seconds a unit of work waits for another process.
