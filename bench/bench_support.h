@@ -99,7 +99,7 @@ class ValidatingUser : public host::UserAgent {
 // `count` operations, the six kinds in turn, `kPerMonth` of each kind a month going
 // back from March 2024; nine client invoices in ten posted (a PIECE row, half of
 // them final), the clients of the demo dossier in turn, bank and cash operations on
-// the accounts their browsers open on.
+// the accounts their browsers open on, and one ledger movement of each on its account.
 inline void fillWithOperations(host::Database& db, long long count, long long kPerMonth) {
   db.begin();
   host::Statement& operations = db.prepare(R"(
@@ -124,6 +124,15 @@ inline void fillWithOperations(host::Database& db, long long count, long long kP
     INSERT INTO PIECE (NPIES, NPIEC, NUMJL, DTOPE, IMPUT)
     SELECT NPIES, NPIEC, NUMJL, DTOPE, CASE WHEN CAST(IDENT AS INTEGER) % 12 = 1 THEN 'O' ELSE '' END
     FROM MIRVAE WHERE NPIES <> ''
+  )");
+  // One movement of each operation on its account, so that an account's sums (the
+  // bank and cash balances) read a ledger of the dossier's size.
+  db.exec(R"(
+    INSERT INTO MOUVE (UNIQ, NPIES, NLIGS, NUMCP, NUMJL, DTOPE, LIBEC, MONNAIE_IDENT, MTDEBS, MTCRES, MTDEB, MTCRE,
+                       INDX2)
+    SELECT rowid, printf('%011d', rowid), printf('%011d0001', rowid), NUMCP, NUMJL, DTOPE, INPIE, 'EUR', TTC, '0',
+           TTC, '0', NUMCP || '|' || DTOPE
+    FROM MIRVAE
   )");
   db.commit();
 }

@@ -117,7 +117,10 @@ class WatchedStatements {
         [](unsigned, void* context, void* statement, void*) {
           const char* sql = sqlite3_sql(static_cast<sqlite3_stmt*>(statement));
           std::string text = sql ? sql : "";
-          if (text.find("FROM \"MIRVAE\"") != std::string::npos || text.find("FROM \"MOUVE\"") != std::string::npos)
+          bool watched = false;
+          for (const char* from : {"FROM \"MIRVAE\"", "FROM MIRVAE ", "FROM \"MOUVE\"", "FROM MOUVE "})
+            watched = watched || text.find(from) != std::string::npos;
+          if (watched)
             static_cast<WatchedStatements*>(context)->seen_.insert(text);
           return 0;
         },
@@ -189,7 +192,7 @@ int main(int argc, char** argv) {
   std::size_t smallRows = opening(kSmall), largeRows = opening(kLarge);
   std::cout << "client invoices of " << kMonth << ": " << smallRows << " (small dossier), " << largeRows
             << " (large dossier)\n";
-  if (!indexed) std::cout << "WARNING: a browser's request scans MIRVAE or MOUVE\n";
+  if (!indexed) std::cout << "a browser's request scans MIRVAE or MOUVE (target: none does): MISSED\n";
 
   bench::Figures figures;
   if (!bench::run(argc, argv, figures, false)) return 1;
@@ -210,5 +213,5 @@ int main(int argc, char** argv) {
               slowestOpening <= 50 ? "met" : "MISSED");
   std::printf("ratio large/small: %.2f (target <= 1.5: %s%s)\n", ratio, ratio <= 1.5 ? "met" : "MISSED",
               indexed ? "" : ", a request scans MIRVAE");
-  return 0;
+  return indexed ? 0 : 1;
 }

@@ -55,8 +55,10 @@ CREATE TABLE "MIRVAE" (
   PRIMARY KEY ("IDENT")
 );
 CREATE INDEX "MIRVAE_INDX1" ON "MIRVAE" ("TYPE", "DTOPE", "NPIEC", "IDENT");
--- A browser limited to one account (a client, a bank) reads it in the same order.
+-- A browser limited to one account (a client, a bank) or to one piece number reads it
+-- in the same order.
 CREATE INDEX "MIRVAE_COMPTE" ON "MIRVAE" ("TYPE", "NUMCP", "DTOPE", "NPIEC", "IDENT");
+CREATE INDEX "MIRVAE_PIECE" ON "MIRVAE" ("TYPE", "NPIEC", "DTOPE", "IDENT");
 CREATE INDEX "MIRVAE_NPIES" ON "MIRVAE" ("NPIES");
 
 -- Operation lines. IDENT is the line's own identifier (8 characters, "NDOC" counter).

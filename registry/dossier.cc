@@ -94,10 +94,12 @@ void creerDossier(const std::string& path, std::string_view referenceSql) {
 const std::vector<host::Database::MiseANiveau> kUpgrades = {
     {"1", "2",
      // Settlement: the lettering day of a movement and the lettering group of a due
-     // date; browsers limited to one account read it through an index.
+     // date; browsers limited to one account or one piece number read it through an
+     // index.
      R"(ALTER TABLE "MOUVE" ADD COLUMN "DTLET" DATE TEXT NOT NULL DEFAULT '';
         ALTER TABLE "ECHEA" ADD COLUMN "RELET" TEXT NOT NULL DEFAULT '';
-        CREATE INDEX IF NOT EXISTS "MIRVAE_COMPTE" ON "MIRVAE" ("TYPE", "NUMCP", "DTOPE", "NPIEC", "IDENT");)"},
+        CREATE INDEX IF NOT EXISTS "MIRVAE_COMPTE" ON "MIRVAE" ("TYPE", "NUMCP", "DTOPE", "NPIEC", "IDENT");
+        CREATE INDEX IF NOT EXISTS "MIRVAE_PIECE" ON "MIRVAE" ("TYPE", "NPIEC", "DTOPE", "IDENT");)"},
 };
 
 std::unique_ptr<host::Database> ouvrirDossier(const std::string& path) {

@@ -401,8 +401,9 @@ class TreasuryBrowserTest : public BrowserTest {
  protected:
   // A ledger movement on `account`.
   void mouvement(const char* account, const char* date, const char* debit, const char* credit) {
-    base().exec(std::string("INSERT INTO MOUVE (UNIQ, NUMCP, DTOPE, MTDEB, MTCRE) VALUES (") +
-                std::to_string(++uniq_) + ", '" + account + "', '" + date + "', '" + debit + "', '" + credit + "')");
+    base().exec(std::string("INSERT INTO MOUVE (UNIQ, NUMCP, DTOPE, MTDEB, MTCRE, INDX2) VALUES (") +
+                std::to_string(++uniq_) + ", '" + account + "', '" + date + "', '" + debit + "', '" + credit + "', '" +
+                account + "|" + date + "')");
   }
   int uniq_ = 1000;
 };

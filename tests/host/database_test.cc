@@ -107,7 +107,7 @@ TEST_F(OpeningTest, AFileThatIsNotADossierOfThisVersionIsNamedSo) {
 TEST_F(OpeningTest, ADossierOfThePreviousSchemaIsBroughtUpToDate) {
   Database::creer(dossier_)->exec(
       "INSERT INTO MIRVAE (IDENT, TYPE) VALUES ('00000001', 'FC'); ALTER TABLE MOUVE DROP COLUMN DTLET; "
-      "ALTER TABLE ECHEA DROP COLUMN RELET; DROP INDEX MIRVAE_COMPTE; "
+      "ALTER TABLE ECHEA DROP COLUMN RELET; DROP INDEX MIRVAE_COMPTE; DROP INDEX MIRVAE_PIECE; "
       "UPDATE DOSSIER_INFO SET VALEUR = '1' WHERE CLE = 'schema_version'");
   EXPECT_EQ(opening(dossier_), "le dossier « " + dossier_ + " » est de la version 1 du schéma ; ce programme lit la version 2");
   auto db = registry::ouvrirDossier(dossier_);
@@ -116,6 +116,7 @@ TEST_F(OpeningTest, ADossierOfThePreviousSchemaIsBroughtUpToDate) {
       {"SELECT count(DTLET) FROM MOUVE", "0"},
       {"SELECT count(RELET) FROM ECHEA", "0"},
       {"SELECT IDENT FROM MIRVAE INDEXED BY MIRVAE_COMPTE WHERE TYPE = 'FC'", "00000001"},
+      {"SELECT IDENT FROM MIRVAE INDEXED BY MIRVAE_PIECE WHERE TYPE = 'FC'", "00000001"},
   };
   for (const auto& [query, expected] : after) {
     host::Statement& s = db->prepare(query);
