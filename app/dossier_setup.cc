@@ -16,11 +16,6 @@ using namespace std::chrono;
 
 namespace {
 
-void replaceAll(std::string& text, const std::string& token, const std::string& value) {
-  for (std::size_t at = text.find(token); at != std::string::npos; at = text.find(token, at + value.size()))
-    text.replace(at, token.size(), value);
-}
-
 std::string sqlLiteral(const std::string& text) {
   std::string out = "'";
   for (char c : text) out += c == '\'' ? std::string("''") : std::string(1, c);
@@ -230,11 +225,11 @@ void creerSociete(const std::string& path, const Company& company) {
   year_month_day first = company.exerciseStart;
   year_month_day last = year_month_day(sys_days(first + months(12)) - days(1));
   std::string sql = company_sql;
-  replaceAll(sql, "{{COMPANY}}", sqlLiteral(host::text::trim(company.name)));
-  replaceAll(sql, "{{MONNAIE}}", currency);
-  replaceAll(sql, "{{PDDEX}}", host::jourIso(first));
-  replaceAll(sql, "{{PDFEX}}", host::jourIso(last));
-  replaceAll(sql, "{{PDTCL}}", host::jourIso(last));
+  host::text::replaceAll(sql, "{{COMPANY}}", sqlLiteral(host::text::trim(company.name)));
+  host::text::replaceAll(sql, "{{MONNAIE}}", currency);
+  host::text::replaceAll(sql, "{{PDDEX}}", host::jourIso(first));
+  host::text::replaceAll(sql, "{{PDFEX}}", host::jourIso(last));
+  host::text::replaceAll(sql, "{{PDTCL}}", host::jourIso(last));
   // A keeping currency outside the usual ones is kept with two decimals.
   sql += "\nINSERT OR IGNORE INTO \"MONNAIE\" (\"IDENT\", \"LIBELLE\", \"DECIMALES\", \"ZONE_EURO\") VALUES ('" +
          currency + "', '" + currency + "', 2, 'N');\n";

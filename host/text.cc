@@ -112,4 +112,10 @@ std::string trim(std::string_view s) {
   return std::string(s.substr(begin, end - begin + 1));
 }
 
+void replaceAll(std::string& text, std::string_view token, std::string_view value) {
+  if (token.empty()) return;
+  for (std::size_t at = text.find(token); at != std::string::npos; at = text.find(token, at + value.size()))
+    text.replace(at, token.size(), value);
+}
+
 }  // namespace host::text

@@ -23,6 +23,9 @@ std::string right(std::string_view s, long count);
 std::string upper(std::string_view s);
 // Leading and trailing blanks removed.
 std::string trim(std::string_view s);
+// Replaces every occurrence of `token` in `text` by `value` (a value holding the
+// token is not replaced again).
+void replaceAll(std::string& text, std::string_view token, std::string_view value);
 
 // A text the books can keep is valid UTF-8 without control characters (C0, DEL,
 // C1): a carriage return in a label splits a line of every export, and bytes that

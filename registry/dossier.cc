@@ -8,6 +8,7 @@
 #include <filesystem>
 
 #include "host/error.h"
+#include "host/text.h"
 #include "host/value.h"
 
 extern const char* const dictionary_sql;
@@ -19,11 +20,6 @@ namespace registry {
 using namespace std::chrono;
 
 namespace {
-
-void replaceAll(std::string& text, const std::string& token, const std::string& value) {
-  for (std::size_t at = text.find(token); at != std::string::npos; at = text.find(token, at + value.size()))
-    text.replace(at, token.size(), value);
-}
 
 // A file a dossier is made in before it takes its name; removed with its SQLite
 // companions when the making ends, whichever way.
@@ -59,9 +55,9 @@ void creerDossier(const std::string& path, bool demo, year_month_day today) {
   std::string sql = demo_sql;
   year_month_day first{today.year(), January, day(1)};
   year_month_day last{today.year(), December, day(31)};
-  replaceAll(sql, "{{PDDEX}}", host::jourIso(first));
-  replaceAll(sql, "{{PDFEX}}", host::jourIso(last));
-  replaceAll(sql, "{{PDTCL}}", host::jourIso(last));
+  host::text::replaceAll(sql, "{{PDDEX}}", host::jourIso(first));
+  host::text::replaceAll(sql, "{{PDFEX}}", host::jourIso(last));
+  host::text::replaceAll(sql, "{{PDTCL}}", host::jourIso(last));
   creerDossier(path, sql);
 }
 

@@ -39,11 +39,6 @@ Jour requiredDay(const Donnee& d, const char* what) {
 
 std::string money(const Decimal& amount, int decimals) { return amount.toFixed(decimals); }
 
-void replaceAll(std::string& text, const std::string& token, const std::string& value) {
-  for (std::size_t at = text.find(token); at != std::string::npos; at = text.find(token, at + value.size()))
-    text.replace(at, token.size(), value);
-}
-
 }  // namespace
 
 // ---------------------------------------------------------------------------- procedures
@@ -174,9 +169,9 @@ void Compta::prefixe_numero_piece(Evt* e) {
   std::string prefix = e->parametre(0).chaine();
   std::string moano = e->parametre(1).chaine();
   if (!isYearMonth(moano)) throw HostError("année et mois « " + moano + " » invalides (AAAAMM attendu)");
-  replaceAll(prefix, "[AAAA]", moano.substr(0, 4));
-  replaceAll(prefix, "[AA]", moano.substr(2, 2));
-  replaceAll(prefix, "[MM]", moano.substr(4, 2));
+  host::text::replaceAll(prefix, "[AAAA]", moano.substr(0, 4));
+  host::text::replaceAll(prefix, "[AA]", moano.substr(2, 2));
+  host::text::replaceAll(prefix, "[MM]", moano.substr(4, 2));
   e->parametre(2) = prefix;
 }
 
