@@ -19,8 +19,6 @@ constexpr const char* kQuestion = "Confirmez-vous le changement de devise et le 
 
 class DevisesTest : public Gestion1Test {
  protected:
-  // A client invoice of two lines: 100 at 20 % and 50 without VAT.
-  bool facture() { return creer() && client() && ligne("708500", "100") && ligne("758000", "50"); }
 
   // HT TVA TTC of each line, then the totals, as shown.
   std::string montants() {

@@ -20,8 +20,6 @@ using testing_support::Gestion1Test;
 
 class DocumentTest : public Gestion1Test {
  protected:
-  // A client invoice of two lines, 100 at 20 % and 50 without VAT.
-  bool facture() { return creer() && client() && ligne("708500", "100") && ligne("758000", "50"); }
   std::string mode() { return ecran().modeCourant(); }
 };
 
