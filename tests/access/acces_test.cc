@@ -228,7 +228,7 @@ TEST_F(BrowserTest, PeriodComboHasTheMonthsThenNoPeriodAndTheTwoExercises) {
   EXPECT_EQ(rows[16], " Exercice N+1|N+1| Exercice N+1|N");
 }
 
-TEST_F(BrowserTest, PeriodsGiveTheirDateRanges) {
+TEST_F(BrowserTest, PeriodsGiveTheirDateRangesAndHoldTheTypedDates) {
   ouvrirEcran();
   struct Case {
     const char* period;
@@ -245,57 +245,55 @@ TEST_F(BrowserTest, PeriodsGiveTheirDateRanges) {
     EXPECT_EQ(v("VDATE_DEBUT"), c.from) << c.period;
     EXPECT_EQ(v("VDATE_FIN"), c.to) << c.period;
   }
-}
-
-TEST_F(BrowserTest, DatesOutsideThePeriodAreRefused) {
-  ouvrirEcran();
+  // Dates typed within a period stay inside it.
   mains::saisir(session(), "VMOIAN", "02/2024");
   EXPECT_FALSE(mains::saisir(session(), "VDATE_DEBUT", "31/01/2024"));
-  EXPECT_EQ(session().transcript().textes("message").back(),
-            "La date début doit être comprise entre le 01/02/2024 et le 29/02/2024 !");
+  EXPECT_EQ(dernierMessage(), "La date début doit être comprise entre le 01/02/2024 et le 29/02/2024 !");
   EXPECT_EQ(v("VDATE_DEBUT"), "01/02/2024");
   EXPECT_FALSE(mains::saisir(session(), "VDATE_FIN", "01/03/2024"));
-  EXPECT_EQ(session().transcript().textes("message").back(),
-            "La date fin doit être comprise entre le 01/02/2024 et le 29/02/2024 !");
+  EXPECT_EQ(dernierMessage(), "La date fin doit être comprise entre le 01/02/2024 et le 29/02/2024 !");
   EXPECT_TRUE(mains::saisir(session(), "VDATE_DEBUT", "10/02/2024"));
   EXPECT_EQ(idents(), rows(1, {2, 6}));
 }
 
-TEST_F(BrowserTest, ClosedYearNotReopenedOnlyAllowsConsultation) {
-  base().exec("UPDATE PARAM SET PXCLO = 'C'");
-  ouvrirEcran();
-  mains::saisir(session(), "VMOIAN", "");
-  // Declined at the screen's question, or at the reopening's own confirmation.
-  for (const std::vector<bool>& answers : {std::vector<bool>{false}, std::vector<bool>{true, false}})
-    for (const char* action : {"MODIFIER", "CREER"}) {
-      for (bool answer : answers) user_.ajouterOui(answer);
-      mains::appuyer(session(), action);
+// A closed exercise allows consultation; a change only once the user has reopened it,
+// and none when the dossier cannot be reopened.
+TEST_F(BrowserTest, AClosedYearAllowsAChangeOnlyOnceReopened) {
+  struct Case {
+    const char* closed;            // PXCLO
+    const char* action;
+    std::vector<bool> answers;     // to the screen's question, then the reopening's own
+    const char* mode;              // handed to the entry screen, "" when it is not opened
+    const char* after;             // PXCLO afterwards
+  } cases[] = {
+      {"C", "MODIFIER", {false}, "", "C"},       {"C", "CREER", {false}, "", "C"},
+      {"C", "MODIFIER", {true, false}, "", "C"}, {"C", "CREER", {true, false}, "", "C"},
+      {"C", "GERER", {}, "Vv", "C"},             {"O", "CREER", {}, "", "O"},
+      {"C", "CREER", {true, true}, "VMCAc", "N"},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(std::string(c.closed) + " " + c.action + " " + std::to_string(c.answers.size()));
+    base().exec(std::string("UPDATE PARAM SET PXCLO = '") + c.closed + "'");
+    lancements.clear();
+    ouvrirEcran();
+    mains::saisir(session(), "VMOIAN", "");
+    std::size_t questions = session().transcript().textes("question").size();
+    for (bool answer : c.answers) user_.ajouterOui(answer);
+    mains::appuyer(session(), c.action);
+    EXPECT_EQ(session().transcript().textes("question").size() - questions, c.answers.size());
+    EXPECT_EQ(sql("SELECT PXCLO FROM PARAM"), c.after);
+    if (*c.mode) {
+      ASSERT_EQ(lancements.size(), 1u);
+      EXPECT_EQ(lancements[0].mode, c.mode);
+    } else {
+      EXPECT_TRUE(lancements.empty());
     }
-  EXPECT_TRUE(lancements.empty());
-  EXPECT_EQ(sql("SELECT PXCLO FROM PARAM"), "C");
-  EXPECT_EQ(session().transcript().textes("question").size(), 6u);
-  mains::appuyer(session(), "GERER");
-  ASSERT_EQ(lancements.size(), 1u);
-  EXPECT_EQ(lancements[0].mode, "Vv");
-}
-
-TEST_F(BrowserTest, ClosedYearWithoutReopeningRefusesWithItsLabel) {
-  base().exec("UPDATE PARAM SET PXCLO = 'O'");
-  ouvrirEcran();
-  mains::appuyer(session(), "CREER");
-  EXPECT_TRUE(lancements.empty());
-  EXPECT_EQ(session().transcript().textes("message").back(), sql("SELECT TEXTE FROM LIBEL WHERE CODE = '0240'"));
-}
-
-TEST_F(BrowserTest, AcceptedReopeningLetsTheCreationGoOn) {
-  base().exec("UPDATE PARAM SET PXCLO = 'C'");
-  ouvrirEcran();
-  user_.ajouterOui(true);  // reopen?
-  user_.ajouterOui(true);  // the reopening's own confirmation
-  mains::appuyer(session(), "CREER");
-  EXPECT_EQ(sql("SELECT PXCLO FROM PARAM"), "N");
-  ASSERT_EQ(lancements.size(), 1u);
-  EXPECT_EQ(lancements[0].mode, "VMCAc");
+    // Without a possible reopening, the dossier's own label says why.
+    if (*c.closed == 'O') {
+      EXPECT_EQ(dernierMessage(), sql("SELECT TEXTE FROM LIBEL WHERE CODE = '0240'"));
+    }
+    mains::fermer(session());
+  }
 }
 
 TEST_F(BrowserTest, PieceViewNeedsAnExistingPostedPiece) {
@@ -492,31 +490,20 @@ TEST_F(TreasuryBrowserTest, PaymentsShowTheirAmountsNegatedAndTheDirectionFilter
   EXPECT_EQ(sql("SELECT TTC FROM MIRVAE WHERE IDENT = '" + ident(4, 2) + "'"), "50.00");
 }
 
-struct Depart {
-  const char* sql;
-  const char* message;  // "" when the screen leaves without its own message
-};
-
-class BrowserDepartTest : public BrowserTest, public ::testing::WithParamInterface<Depart> {};
-
-TEST_P(BrowserDepartTest, ScreenLeavesAtOnce) {
-  base().exec(GetParam().sql);
-  EXPECT_FALSE(mains::ouvrir(session(), "MIRVAE-ACCES1"));
-  EXPECT_EQ(session().ecran("MIRVAE-ACCES1"), nullptr);
-  if (*GetParam().message) {
-    EXPECT_EQ(session().transcript().textes("message").back(), GetParam().message);
+// Without the option, or without parameters at all, the screen leaves at once.
+TEST_F(BrowserTest, ScreenLeavesAtOnceWithoutTheOptionOrTheParameters) {
+  const std::pair<const char*, const char*> departs[] = {
+      {"UPDATE PARAM SET PRE18 = 'N'", "L'option < Gestion simplifiée des opérations > n'est pas active !"},
+      {"DELETE FROM PARAM", nullptr}};
+  for (const auto& [query, message] : departs) {
+    base().exec(query);
+    EXPECT_FALSE(mains::ouvrir(session(), "MIRVAE-ACCES1")) << query;
+    EXPECT_EQ(session().ecran("MIRVAE-ACCES1"), nullptr);
+    if (message) {
+      EXPECT_EQ(dernierMessage(), message);
+    }
   }
 }
-
-INSTANTIATE_TEST_SUITE_P(
-    Departs, BrowserDepartTest,
-    ::testing::Values(Depart{"UPDATE PARAM SET PRE18 = 'N'",
-                             "L'option < Gestion simplifiée des opérations > n'est pas active !"},
-                      Depart{"DELETE FROM PARAM", ""}));
-
-}  // namespace
-
-namespace {
 
 class RegistreTest : public testing_support::DossierTest {};
 

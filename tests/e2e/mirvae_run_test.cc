@@ -74,51 +74,39 @@ class MirvaeRunTest : public ::testing::Test {
     std::ofstream(script_) << text;
     return mirvae("run " + quote(dossier.empty() ? dossier_ : dossier) + " " + quote(script_));
   }
-  bool registered(const std::string& module) {
-    std::istringstream names(mirvae("modules").out);
-    for (std::string name; std::getline(names, name);)
-      if (name == module) return true;
-    return false;
-  }
 
   std::string dossier_, script_, other_;
 };
 
-TEST_F(MirvaeRunTest, PlaysASessionOnAFreshDemoDossierEndToEnd) {
-  // The client-invoice list when the library has it; the dossier's own data always.
-  std::string screen = registered("MIRVAE-ACCES1") ? "open MIRVAE-ACCES1\n"
-                                                     "expect screen MIRVAE-ACCES1\n"
-                                                     "expect no error\n"
-                                                     "close\n"
-                                                   : "";
-  Outcome run = play("# une session\ntoday 15/03/2024 10:30\n" + screen +
-                 "expect sql \"SELECT count(*) FROM COMPT WHERE NUMCP LIKE '512%'\" = 2\n"
-                 "expect sql \"SELECT count(*) FROM PIECE\" = 0\n");
-  EXPECT_EQ(run.status, 0) << run.out;
-  if (!screen.empty()) {
-    EXPECT_NE(run.out.find("[ouvre] MIRVAE-ACCES1"), std::string::npos) << run.out;
-    EXPECT_NE(run.out.find("[ferme] MIRVAE-ACCES1"), std::string::npos) << run.out;
+// A script that fails, cannot be understood or cannot be found ends the program with a
+// failure that names the script's line.
+TEST_F(MirvaeRunTest, AScriptThatFailsOrIsMissingExitsNonZeroNamingItsLine) {
+  const struct {
+    std::string dossier, script, text;
+    int status;  // -1: any failure
+    std::string said, why;
+  } cases[] = {
+      {dossier_, script_,
+       "today 15/03/2024\n\nexpect sql \"SELECT count(*) FROM COMPT WHERE NUMCP LIKE '512%'\" = 3\n"
+       "expect sql \"SELECT 1\" = 1\n",
+       1, script_ + ":3: expect sql", "la requête donne « 2 », attendu « 3 »"},
+      {dossier_, script_, "today 15/03/2024\nappuyer VALIDER\n", 1,
+       script_ + ":2: appuyer VALIDER : instruction inconnue", ""},
+      {dossier_, "/nonexistent/script.txt", "", -1, "", ""},
+      {"/nonexistent/dossier.db", script_, "today 15/03/2024\n", -1, "", ""},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.dossier + " " + c.script + " " + c.text);
+    std::ofstream(script_) << c.text;
+    Outcome run = mirvae("run " + quote(c.dossier) + " " + quote(c.script));
+    if (c.status < 0) {
+      EXPECT_NE(run.status, 0) << run.out;
+    } else {
+      EXPECT_EQ(run.status, c.status) << run.out;
+    }
+    EXPECT_NE(run.out.find(c.said), std::string::npos) << run.out;
+    EXPECT_NE(run.out.find(c.why), std::string::npos) << run.out;
   }
-}
-
-TEST_F(MirvaeRunTest, AFailingExpectationExitsNonZeroNamingItsLine) {
-  Outcome run = play("today 15/03/2024\n\nexpect sql \"SELECT count(*) FROM COMPT WHERE NUMCP LIKE '512%'\" = 3\n"
-                 "expect sql \"SELECT 1\" = 1\n");
-  EXPECT_EQ(run.status, 1) << run.out;
-  EXPECT_NE(run.out.find(script_ + ":3: expect sql"), std::string::npos) << run.out;
-  EXPECT_NE(run.out.find("la requête donne « 2 », attendu « 3 »"), std::string::npos) << run.out;
-}
-
-TEST_F(MirvaeRunTest, ALineThatCannotBeUnderstoodExitsNonZeroNamingItsLine) {
-  Outcome run = play("today 15/03/2024\nappuyer VALIDER\n");
-  EXPECT_EQ(run.status, 1) << run.out;
-  EXPECT_NE(run.out.find(script_ + ":2: appuyer VALIDER : instruction inconnue"), std::string::npos) << run.out;
-}
-
-TEST_F(MirvaeRunTest, AMissingScriptOrDossierIsRefused) {
-  EXPECT_NE(mirvae("run " + quote(dossier_) + " /nonexistent/script.txt").status, 0);
-  std::ofstream(script_) << "today 15/03/2024\n";
-  EXPECT_NE(mirvae("run /nonexistent/dossier.db " + quote(script_)).status, 0);
 }
 
 TEST_F(MirvaeRunTest, TheDemoMakesItsDossierAndNeverReplacesAnotherFile) {

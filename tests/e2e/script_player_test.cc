@@ -209,20 +209,6 @@ TEST_F(ScriptPlayerTest, AScriptQueryCannotChangeTheSessionNorTheDossier) {
   }
 }
 
-TEST_F(ScriptPlayerTest, ExpectationsOnTheLastActionNeedOne) {
-  EXPECT_EQ(jouer("open ESSAI-SCRIPT\npress ECHOUER\nexpect accepted\n"), 1);
-  EXPECT_NE(out_.find("essai.txt:3: expect accepted : la dernière action a été refusée : « "), std::string::npos)
-      << out_;
-  EXPECT_NE(out_.find("panne voulue »"), std::string::npos) << out_;
-  EXPECT_EQ(jouer("open ESSAI-SCRIPT\npress ECHOUER\nexpect refused\n"), 1);
-  EXPECT_NE(out_.find("essai.txt:3: expect refused : la dernière action a échoué sans refus : « "), std::string::npos)
-      << out_;
-  EXPECT_EQ(jouer("expect accepted\n"), 1);
-  EXPECT_NE(out_.find("essai.txt:1: expect accepted : aucune action n'a encore été jouée"), std::string::npos);
-  EXPECT_EQ(jouer("open ESSAI-SCRIPT\ntype VNOM personne\nexpect refused VNOMS\n"), 1);
-  EXPECT_NE(out_.find("aucun refus sur VNOMS"), std::string::npos) << out_;
-}
-
 TEST_F(ScriptPlayerTest, AnswersAreTakenInOrderAsQuestionsCome) {
   int rc = jouer(R"(open ESSAI-SCRIPT
 answer yes
@@ -245,6 +231,9 @@ expect message abandon
   EXPECT_EQ(rc, 0) << out_;
   EXPECT_NE(out_.find("[question] Continuer ?\n[réponse] oui"), std::string::npos) << out_;
   EXPECT_NE(out_.find("[choix] Comptes\n[réponse] (abandon)"), std::string::npos) << out_;
+  // An answer no question took fails the script at the answer.
+  EXPECT_EQ(jouer("open ESSAI-SCRIPT\nanswer yes\nanswer no\npress DEMANDER\nclose\n"), 1);
+  EXPECT_NE(out_.find("essai.txt:3: answer no : réponse jamais demandée"), std::string::npos) << out_;
 }
 
 TEST_F(ScriptPlayerTest, AQuestionWithoutItsAnswerFailsLoudlyAndUndoesTheAction) {
@@ -274,11 +263,6 @@ TEST_F(ScriptPlayerTest, AQuestionWithoutItsAnswerFailsLoudlyAndUndoesTheAction)
   EXPECT_EQ(sql("SELECT PRE18 FROM PARAM WHERE PNUME = 1"), "O");
 }
 
-TEST_F(ScriptPlayerTest, AnAnswerNoQuestionTookFailsTheScriptAtTheAnswer) {
-  EXPECT_EQ(jouer("open ESSAI-SCRIPT\nanswer yes\nanswer no\npress DEMANDER\nclose\n"), 1);
-  EXPECT_NE(out_.find("essai.txt:3: answer no : réponse jamais demandée"), std::string::npos) << out_;
-}
-
 TEST_F(ScriptPlayerTest, AModalScreenPlaysTheFollowingLinesUntilItCloses) {
   int rc = jouer(R"(open ESSAI-SCRIPT
 press MODALE
@@ -299,11 +283,6 @@ expect message "Bonjour Léa"
   EXPECT_LT(at("[message] modale x"), at("[ferme] ESSAI-MODALE"));
   EXPECT_LT(at("[ferme] ESSAI-MODALE"), at("[message] retour"));
   EXPECT_LT(at("[message] retour"), at("[message] Bonjour Léa"));
-
-  // A failure inside the modal screen stops the whole script there.
-  EXPECT_EQ(jouer("open ESSAI-SCRIPT\npress MODALE\nexpect value VVAL y\nclose\nsay \"jamais joué\"\n"), 1);
-  EXPECT_NE(out_.find("essai.txt:3: expect value VVAL y : VVAL vaut «  », attendu « y »"), std::string::npos) << out_;
-  EXPECT_EQ(out_.find("jamais joué"), std::string::npos);
 }
 
 TEST_F(ScriptPlayerTest, TheListIsCountedSearchedAndSelected) {
@@ -316,12 +295,30 @@ press VOIR
 expect message "Compte 512200"
 )");
   EXPECT_EQ(rc, 0) << out_;
-  EXPECT_EQ(jouer("open ESSAI-BANQUES\nexpect row 3 NUMCP 512300\n"), 1);
-  EXPECT_NE(out_.find("essai.txt:2: expect row 3 NUMCP 512300 : la liste n'a que 2 lignes"), std::string::npos);
-  EXPECT_EQ(jouer("open ESSAI-BANQUES\nexpect row 1 NUMCPX 512100\n"), 1);
-  EXPECT_NE(out_.find("pas de colonne NUMCPX ; colonnes : "), std::string::npos) << out_;
-  EXPECT_EQ(jouer("open ESSAI-BANQUES\nexpect row containing 411\n"), 1);
-  EXPECT_NE(out_.find("aucune des 2 lignes de la liste ne contient « 411 »"), std::string::npos) << out_;
+}
+
+// Expectations on the last action, on a list and inside a modal screen: each stops the
+// script at its line, saying why.
+TEST_F(ScriptPlayerTest, AScriptStopsAtTheLineThatFailsSayingWhy) {
+  const std::pair<const char*, const char*> cases[] = {
+      {"open ESSAI-SCRIPT\npress ECHOUER\nexpect accepted\n",
+       "essai.txt:3: expect accepted : la dernière action a été refusée : « ECHOUER : panne voulue »"},
+      {"open ESSAI-SCRIPT\npress ECHOUER\nexpect refused\n",
+       "essai.txt:3: expect refused : la dernière action a échoué sans refus : « "},
+      {"expect accepted\n", "essai.txt:1: expect accepted : aucune action n'a encore été jouée"},
+      {"open ESSAI-SCRIPT\ntype VNOM personne\nexpect refused VNOMS\n", "aucun refus sur VNOMS"},
+      {"open ESSAI-SCRIPT\npress MODALE\nexpect value VVAL y\nclose\n",
+       "essai.txt:3: expect value VVAL y : VVAL vaut «  », attendu « y »"},
+      {"open ESSAI-BANQUES\nexpect row 3 NUMCP 512300\n",
+       "essai.txt:2: expect row 3 NUMCP 512300 : la liste n'a que 2 lignes"},
+      {"open ESSAI-BANQUES\nexpect row 1 NUMCPX 512100\n", "pas de colonne NUMCPX ; colonnes : "},
+      {"open ESSAI-BANQUES\nexpect row containing 411\n", "aucune des 2 lignes de la liste ne contient « 411 »"},
+  };
+  for (const auto& [script, why] : cases) {
+    EXPECT_EQ(jouer(std::string(script) + "say \"jamais joué\"\n"), 1) << script;
+    EXPECT_NE(out_.find(why), std::string::npos) << script << "\n" << out_;
+    EXPECT_EQ(out_.find("jamais joué"), std::string::npos) << script;
+  }
 }
 
 TEST_F(ScriptPlayerTest, TodaySetsTheHostClock) {

@@ -53,20 +53,16 @@ TEST_F(ControlesTest, HeaderChecksRunInOrderAndOnlyTheFirstFailureIsShown) {
   }
 }
 
-TEST_F(ControlesTest, APieceWhoseLinesTotalZeroIsRefused) {
+TEST_F(ControlesTest, NoLineBeforeTheHeaderPassesAndNoPieceWhoseLinesTotalZero) {
   ASSERT_TRUE(creer());
+  EXPECT_FALSE(model::nouvelleLigne(session()));
+  EXPECT_EQ(dernierMessage(), "La saisie d'un client est obligatoire !");
   ASSERT_TRUE(client());
   ASSERT_TRUE(ligne("708500", "100"));
   ASSERT_TRUE(ligne("708500", "-100"));
   enregistrer("1");
   EXPECT_EQ(dernierMessage(), "La saisie d'une pièce dont le total est nul n'est pas autorisée !");
   EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAE"), 0);
-}
-
-TEST_F(ControlesTest, TheLinesCannotBeReachedBeforeTheHeaderPasses) {
-  ASSERT_TRUE(creer());
-  EXPECT_FALSE(model::nouvelleLigne(session()));
-  EXPECT_EQ(dernierMessage(), "La saisie d'un client est obligatoire !");
 }
 
 TEST_F(ControlesTest, OperationDateMustLieBetweenExerciseStartAndClosingDate) {
@@ -118,9 +114,7 @@ TEST_F(ControlesTest, AccountCheckNamesWhatIsWrong) {
     }
     model::fermer(session());
   }
-}
-
-TEST_F(ControlesTest, ClientTypedByLabelSetsTheHeaderAccount) {
+  // A client typed by its title sets the header's account, and an empty title clears it.
   ASSERT_TRUE(creer());
   ASSERT_TRUE(client("Cabinet Vaillergues"));
   EXPECT_EQ(valeur("MIRVAE.NUMCP"), "411003");

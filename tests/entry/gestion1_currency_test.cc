@@ -19,8 +19,6 @@ constexpr const char* kQuestion = "Confirmez-vous le changement de devise et le 
 
 class DevisesTest : public Gestion1Test {
  protected:
-  // A client invoice of two lines: 100 at 20 % and 50 without VAT.
-  bool facture() { return creer() && client() && ligne("708500", "100") && ligne("758000", "50"); }
 
   // HT TVA TTC of each line, then the totals, as shown.
   std::string montants() {
@@ -74,7 +72,7 @@ TEST_F(DevisesTest, TheChoiceWindowChangesTheCurrencyOfAnEmptyDocumentAndACancel
   EXPECT_EQ(questions(), 0u);
 }
 
-TEST_F(DevisesTest, AFixedRateCannotBeTyped) {
+TEST_F(DevisesTest, EachCurrencyTakesItsRateAFixedOneCannotBeTypedAndNoneIsRefused) {
   const struct {
     const char* currency;
     const char* rate;
@@ -89,6 +87,9 @@ TEST_F(DevisesTest, AFixedRateCannotBeTyped) {
     EXPECT_EQ(ecran().ecran()->estInterdit("COURS"), c.fixed);
     EXPECT_EQ(saisir("MIRVAE.COURS", "2"), !c.fixed);
   }
+  EXPECT_FALSE(saisir("MIRVAE.MONNAIE_IDENT", ""));
+  EXPECT_EQ(dernierMessage(), "La saisie d'une monnaie est obligatoire !");
+  EXPECT_EQ(valeur("MIRVAE.MONNAIE_IDENT"), "JPY");
 }
 
 // A rate typed by hand stays the document's and leaves its amounts as they are: they

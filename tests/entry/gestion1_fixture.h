@@ -55,6 +55,9 @@ class Gestion1Test : public DossierTest {
     return !validate || model::validerLigne(session());
   }
 
+  // A client invoice of two lines: 100 at 20 % and 50 without VAT.
+  bool facture() { return creer() && client() && ligne("708500", "100") && ligne("758000", "50"); }
+
   // Presses the validation button and answers the dialog of a creation with `choice`.
   bool enregistrer(const std::string& choice = "1") {
     user_.ajouterDialogue(choice);

@@ -97,10 +97,13 @@ TEST_F(LignesTest, IncludingTaxSwapsTheColumnCaptionsAndEveryLineAtOnce) {
             "758000 " + sql("SELECT LIBCP FROM COMPT WHERE NUMCP = '758000'"));
 }
 
-TEST_F(LignesTest, AnOvertypedVatIsKeptAndOnlyTheOtherAmountFollows) {
+TEST_F(LignesTest, AnUnknownVatCodeIsRefusedAndAnOvertypedVatIsKept) {
   ASSERT_TRUE(creer());
   ASSERT_TRUE(client());
   ASSERT_TRUE(ligne("708500", "100", "-", false));
+  EXPECT_FALSE(saisir("LST_MIRVAL.COTVA", "X99"));
+  EXPECT_EQ(dernierMessage(), "Le code TVA est inexistant !");
+  EXPECT_EQ(valeur("LST_MIRVAL.COTVA"), "V20");
   ASSERT_TRUE(saisir("LST_MIRVAL.TVA", "19.99"));
   EXPECT_EQ(valeur("LST_MIRVAL.HT"), "100.00");
   EXPECT_EQ(valeur("LST_MIRVAL.TVA"), "19.99");
@@ -162,15 +165,6 @@ TEST_F(LignesTest, LineChecksRefuseTheLineInTheirOrder) {
     EXPECT_TRUE(model::lignes(session()).empty());
     model::fermer(session());
   }
-}
-
-TEST_F(LignesTest, AnUnknownVatCodeIsRefused) {
-  ASSERT_TRUE(creer());
-  ASSERT_TRUE(client());
-  ASSERT_TRUE(ligne("708500", "100", "-", false));
-  EXPECT_FALSE(saisir("LST_MIRVAL.COTVA", "X99"));
-  EXPECT_EQ(dernierMessage(), "Le code TVA est inexistant !");
-  EXPECT_EQ(valeur("LST_MIRVAL.COTVA"), "V20");
 }
 
 TEST_F(LignesTest, WithoutVatManagementLinesCarryNoVatAndItsColumnsAreForbidden) {
