@@ -10,6 +10,7 @@
 #include "app/exports.h"
 #include "app/print.h"
 #include "app/script.h"
+#include "app/serve.h"
 #include "host/clock.h"
 #include "host/error.h"
 #include "host/registry.h"
@@ -55,6 +56,13 @@ int main(int argc, char** argv) {
   printCommand->add_option("--direction", print.direction, "Liste de banque ou de caisse : D dépenses, R recettes");
   printCommand->add_option("-o,--output", print.output, "Fichier PDF (sinon le dossier d'impressions du dossier)");
 
+  app::ServeOptions serve;
+  CLI::App* serveCommand = program.add_subcommand("serve", "Montre les écrans du dossier dans un navigateur");
+  serveCommand->add_option("DOSSIER", serve.dossier, "Dossier")->required()->check(CLI::ExistingFile);
+  serveCommand->add_option("--port", serve.port, "Port (0 : un port libre)")->check(CLI::Range(0, 65535));
+  serveCommand->add_option("--host", serve.host, "Adresse d'écoute");
+  serveCommand->add_flag("--allow-remote", serve.allowRemote, "Accepte une adresse d'écoute qui n'est pas locale");
+
   CLI11_PARSE(program, argc, argv);
 
   try {
@@ -73,6 +81,7 @@ int main(int argc, char** argv) {
       std::cout << "Impression : " << app::imprimer(print) << "\n";
       return 0;
     }
+    if (serveCommand->parsed()) return app::servir(serve, std::cout);
     if (run->parsed()) return app::jouerFichier(dossier, script, std::cout);
     if (demoCommand->parsed()) return app::demo(dossier.empty() ? "demo.db" : dossier, std::cout);
     if (ledger->parsed()) {

@@ -15,16 +15,19 @@ namespace {
 // last Unicode character.
 const char kAfterAll[] = "\xF4\x8F\xBF\xBF";
 
-long long memoryImageCounter = 0;
+// Memory images are temporary tables of a session's own connection, and a session
+// lives on one thread (several sessions of one process each have theirs): the count
+// and the map below are the thread's.
+thread_local long long memoryImageCounter = 0;
 
-// Memory images open in this process: (owner, image name) -> physical table and
+// Memory images open on this thread: (owner, image name) -> physical table and
 // the number of bindings on it. The last binding to go drops the table.
 struct SharedImage {
   std::string physical;
   int bindings = 0;
 };
 std::map<std::pair<const Automate*, std::string>, SharedImage>& sharedImages() {
-  static std::map<std::pair<const Automate*, std::string>, SharedImage> images;
+  thread_local std::map<std::pair<const Automate*, std::string>, SharedImage> images;
   return images;
 }
 

@@ -1,5 +1,6 @@
 #include "model/impression.h"
 
+#include <atomic>
 #include <unistd.h>
 
 #include <cstdio>
@@ -98,7 +99,7 @@ void Imprimante::terminer() {
   std::string name = printName(document.module);
   std::filesystem::path folder = file_ ? std::filesystem::path(*file_).parent_path() : std::filesystem::path(*folder_);
   if (!folder.empty()) std::filesystem::create_directories(folder);
-  static int scratches = 0;
+  static std::atomic<int> scratches{0};  // sessions of one process print side by side
   std::string scratch =
       (folder / ("." + name + "-" + std::to_string(::getpid()) + "-" + std::to_string(++scratches) + ".part")).string();
   writePdf(*layout, document, companyOf(session.base()), decimalsOf, scratch);

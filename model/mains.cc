@@ -309,6 +309,20 @@ bool choisirLigne(Session& session, int n) {
   });
 }
 
+bool estInterdit(Session& session, const std::string& object) {
+  Automate& screen = ecranDevant(session);
+  for (const std::string& name : namesOf(screen, object))
+    if (screen.ecran()->estInterdit(name)) return true;
+  return false;
+}
+
+bool estCache(Session& session, const std::string& object) {
+  Automate& screen = ecranDevant(session);
+  for (const std::string& name : namesOf(screen, object))
+    if (screen.ecran()->estCache(name)) return true;
+  return false;
+}
+
 std::string valeur(Session& session, const std::string& object) {
   Automate& screen = ecranDevant(session);
   AmountDecimals decimals;

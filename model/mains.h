@@ -71,6 +71,11 @@ std::size_t nombreLignes(host::Session& session);
 // Selects row n (from 1) of an access list.
 bool choisirLigne(host::Session& session, int n);
 
+// Whether the screen in front forbade (disabled) or hid `object`, under any of its
+// names: what the hands refuse to act on, and what a front end greys or leaves out.
+bool estInterdit(host::Session& session, const std::string& object);
+bool estCache(host::Session& session, const std::string& object);
+
 // What the screen shows for `object` (named as for saisir): dates DD/MM/YYYY.
 std::string valeur(host::Session& session, const std::string& object);
 
