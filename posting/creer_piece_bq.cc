@@ -6,6 +6,7 @@
 #include "host/clock.h"
 #include "host/currency.h"
 #include "host/error.h"
+#include "host/text.h"
 
 MIRVAECreer_piece_bq::MIRVAECreer_piece_bq(host::Evt* e) : MIRVAECreer_piece_bq(e, 4, "CREER_LIGNE_BANQUE") {}
 
@@ -53,11 +54,6 @@ std::string letteringCode(long long n) {
 
 std::string lower(std::string code) {
   for (char& c : code) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
-  return code;
-}
-
-std::string upper(std::string code) {
-  for (char& c : code) c = static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
   return code;
 }
 
@@ -263,7 +259,7 @@ void MIRVAECreer_piece_bq::addDifference(const char* journal, const char* label,
 }
 
 std::string MIRVAECreer_piece_bq::settlementGroup() {
-  std::string group = upper(MOUVE_RELET.chaine());
+  std::string group = host::text::upper(MOUVE_RELET.chaine());
   std::vector<std::string> earlier;
   ECHEA2.initRequete();
   ECHEA2.ajouteFiltre(ECHEA2_UNIQ, '=', ECHEA_UNIQ);
@@ -308,7 +304,7 @@ void MIRVAECreer_piece_bq::renameGroup(const std::string& from, const std::strin
     MOUVE2.initRequete();
   }
   // The line movement in the buffer may be one of them.
-  if (upper(MOUVE_RELET.chaine()) == from) MOUVE.lit(3, MOUVE_UNIQ, '=', MOUVE_UNIQ);
+  if (host::text::upper(MOUVE_RELET.chaine()) == from) MOUVE.lit(3, MOUVE_UNIQ, '=', MOUVE_UNIQ);
   groups_.erase(std::remove(groups_.begin(), groups_.end(), from), groups_.end());
 }
 
