@@ -77,10 +77,13 @@ std::optional<Jour> lireJour(std::string_view raw) {
       return makeDay(y, m, d);
     return std::nullopt;
   }
-  if (text.size() == 8 && text.find_first_not_of("0123456789") == std::string::npos) {
+  if ((text.size() == 8 || text.size() == 6) && text.find_first_not_of("0123456789") == std::string::npos) {
     readNumber(std::string_view(text).substr(0, 2), d);
     readNumber(std::string_view(text).substr(2, 2), m);
-    readNumber(std::string_view(text).substr(4, 4), y);
+    readNumber(std::string_view(text).substr(4), y);
+    // Two digits of year, as accountants type them: 00 to 68 are this century, 69
+    // to 99 the last one (the usual window of two-digit years).
+    if (text.size() == 6) y += y <= 68 ? 2000 : 1900;
     return makeDay(y, m, d);
   }
   std::size_t first = text.find('/');

@@ -35,7 +35,8 @@ std::string jourIso(const Jour& day);
 // The year and month of a day, "YYYYMM": the form counters and closed periods are
 // kept in, and compared as text. "" for the empty date.
 std::string yearMonth(const Jour& day);
-// Reads "DD/MM/YYYY", "D/M/YYYY", "DDMMYYYY" or "YYYY-MM-DD"; "" is the empty date.
+// Reads "DD/MM/YYYY", "D/M/YYYY", "DDMMYYYY", "DDMMYY" (00-68: 20YY, 69-99: 19YY) or
+// "YYYY-MM-DD"; "" is the empty date.
 // Returns nothing for any other text and for an impossible day (31/02/2024).
 std::optional<Jour> lireJour(std::string_view text);
 

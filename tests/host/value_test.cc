@@ -14,9 +14,13 @@ TEST(Date, EndOfMonthAndTextForms) {
   EXPECT_EQ(d.chaine(), "29/02/2024");
   d = Date::dJour(Date::finMois(Date::jDate("15/02/2023")));
   EXPECT_EQ(d.chaine(), "28/02/2023");
-  for (const char* text : {"29/02/2024", "2024-02-29", "29022024", "29/2/2024"}) {
+  for (const char* text : {"29/02/2024", "2024-02-29", "29022024", "29/2/2024", "290224"}) {
     d = text;
     EXPECT_EQ(d.chaine(), "29/02/2024") << text;
+  }
+  for (auto [typed, read] : {std::pair{"311268", "31/12/2068"}, {"010169", "01/01/1969"}}) {
+    d = typed;
+    EXPECT_EQ(d.chaine(), read) << typed;
   }
   EXPECT_EQ(Date::eDate("2024-03-01", "/"), "01/03/2024");
   EXPECT_EQ(Date::eDate("2024-03-01", "."), "01.03.2024");
@@ -35,7 +39,7 @@ TEST(Date, EmptyDateIsEmptyAndComesFirst) {
 
 TEST(Date, RefusesWhatIsNotADate) {
   Date d("DTOPE", "", "", 0, nullptr);
-  for (const char* bad : {"31/02/2024", "2024/02/01", "demain", "12/13/2024", "1/1/24"}) {
+  for (const char* bad : {"31/02/2024", "2024/02/01", "demain", "12/13/2024", "1/1/24", "290223", "2902024"}) {
     try {
       d = bad;
       ADD_FAILURE() << bad;
