@@ -35,14 +35,6 @@ constexpr Fabrique kDoublures[] = {&fabriquer<Doublure<0>>, &fabriquer<Doublure<
                                    &fabriquer<Doublure<3>>, &fabriquer<Doublure<4>>, &fabriquer<Doublure<5>>,
                                    &fabriquer<Doublure<6>>};
 
-// Puts `fabrique` under `name` and gives back what was there (null when the module
-// is not built yet: the double then stays, as the registry outlives the test).
-Fabrique remplacer(const std::string& name, Fabrique fabrique) {
-  if (Registre::instance().module(name)) return Registre::instance().substituer(name, fabrique);
-  Module("", name.c_str(), fabrique, false, "");
-  return nullptr;
-}
-
 // Each kind's operations, alike: one posted in February, one not posted, one whose
 // piece is not yet posted in March, one of the previous exercise whose piece is gone
 // (so posted), and one on an account that no longer exists. Bank and cash keep all
@@ -71,8 +63,9 @@ class BrowserTest : public testing_support::DossierTest {
   void SetUp() override {
     DossierTest::SetUp();
     lancements.clear();
-    for (int kind = 1; kind <= 6; ++kind) gestions_[kind] = remplacer("MIRVAE-GESTION" + std::to_string(kind), kDoublures[kind]);
-    visu_ = Registre::instance().substituer("COMPTA-VISUECRI", kDoublures[0]);
+    for (int kind = 0; kind <= 6; ++kind)
+      standIns_.push_back(std::make_unique<testing_support::ModuleStandIn>(
+          kind == 0 ? "COMPTA-VISUECRI" : "MIRVAE-GESTION" + std::to_string(kind), kDoublures[kind]));
     for (const Sorte& s : kSortes) {
       const std::string type = registry::operationKind(s.kind).type, k = std::to_string(s.kind);
       auto row = [&](int n, const char* date, const char* account, const char* npies, const char* direction,
@@ -88,12 +81,6 @@ class BrowserTest : public testing_support::DossierTest {
       row(6, "2024-02-25", s.gone, "", "D", "7.50");
       base().exec("INSERT INTO PIECE (NPIES, IMPUT) VALUES ('P" + k + "1', 'O'), ('P" + k + "3', '')");
     }
-  }
-  void TearDown() override {
-    for (int kind = 1; kind <= 6; ++kind)
-      if (gestions_[kind]) Registre::instance().substituer("MIRVAE-GESTION" + std::to_string(kind), gestions_[kind]);
-    Registre::instance().substituer("COMPTA-VISUECRI", visu_);
-    DossierTest::TearDown();
   }
 
   void ouvrirEcran(int kind = 1) { ASSERT_TRUE(mains::ouvrir(session(), "MIRVAE-ACCES" + std::to_string(kind))); }
@@ -112,8 +99,7 @@ class BrowserTest : public testing_support::DossierTest {
   std::string dernierMessage() { return session().transcript().textes("message").back(); }
   std::string libelleCompte(const std::string& numcp) { return sql("SELECT LIBCP FROM COMPT WHERE NUMCP = '" + numcp + "'"); }
 
-  Fabrique gestions_[7] = {};
-  Fabrique visu_ = nullptr;
+  std::vector<std::unique_ptr<testing_support::ModuleStandIn>> standIns_;
 };
 
 // ---------------------------------------------------------------------------- every kind
@@ -503,46 +489,6 @@ TEST_F(BrowserTest, ScreenLeavesAtOnceWithoutTheOptionOrTheParameters) {
       EXPECT_EQ(dernierMessage(), message);
     }
   }
-}
-
-class RegistreTest : public testing_support::DossierTest {};
-
-TEST_F(RegistreTest, UnitsDeclareInLoadOrder) {
-  std::vector<std::string> library;
-  for (const auto& d : host::Registre::instance().declarations())
-    if (d.name.rfind("MIRVAE", 0) == 0 || d.sorte != host::Declaration::kModule) {
-      const char* kind[] = {"Global", "Module", "Source", "Variable"};
-      library.push_back(std::string(kind[d.sorte]) + " " + d.name);
-    }
-  std::vector<std::string> expected = {
-      "Global MIRVAE", "Module MIRVAE-ACCES1", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-ACCES2", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-ACCES3", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-ACCES4", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-ACCES5", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-ACCES6", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_FC", "Module MIRVAE-GESTION1", "Module MIRVAE-SUPPRIMER_PIECE",
-      "Module MIRVAE-VERIFIER_MODIF_PIECE", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_FF", "Module MIRVAE-GESTION2", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_NDF", "Module MIRVAE-GESTION3", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_BQ", "Module MIRVAE-GESTION4", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_CA", "Module MIRVAE-GESTION5", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-CREER_PIECE_OD", "Module MIRVAE-GESTION6", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-GEST_ANA", "Source MIRVAE",
-      "Module MIRVAE-GEST_JUS", "Source MIRVAE",
-      "Global MIRVAE", "Module MIRVAE-IMPR_FICHE1", "Module MIRVAE-IMPR_FICHE2", "Module MIRVAE-IMPR_FICHE3",
-      "Module MIRVAE-IMPR_FICHE4", "Module MIRVAE-IMPR_FICHE5", "Module MIRVAE-IMPR_FICHE6",
-      "Module MIRVAE-IMPR_LISTE1", "Module MIRVAE-IMPR_LISTE2", "Module MIRVAE-IMPR_LISTE3",
-      "Module MIRVAE-IMPR_LISTE4", "Module MIRVAE-IMPR_LISTE5", "Module MIRVAE-IMPR_LISTE6", "Source MIRVAE",
-      "Global COMPTA", "Global MIRVAE", "Module MIRVAE-INTERFACE", "Source MIRVAE"};
-  // Modules the tests stand in for, when the library has not built them yet, come
-  // after the library's own declarations.
-  if (library.size() > expected.size()) library.resize(expected.size());
-  EXPECT_EQ(library, expected);
-  for (const auto& d : host::Registre::instance().declarations())
-    if (d.sorte == host::Declaration::kModule && d.name.rfind("MIRVAE", 0) == 0) {
-      EXPECT_EQ(d.label, d.name == "MIRVAE-GEST_JUS" ? "Justification Règlement" : "") << d.name;
-    }
 }
 
 }  // namespace

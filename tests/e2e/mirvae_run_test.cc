@@ -21,22 +21,9 @@
 
 namespace {
 
-struct Outcome {
-  int status;
-  std::string out;  // standard output and error together
-};
+using Outcome = testing_support::CommandResult;
 
-// Runs a shell command and keeps what it printed.
-Outcome run(const std::string& command_line) {
-  std::string command = command_line + " 2>&1";
-  FILE* pipe = ::popen(command.c_str(), "r");
-  if (!pipe) return {-1, "popen"};
-  std::string out;
-  char buffer[4096];
-  for (std::size_t n; (n = std::fread(buffer, 1, sizeof buffer, pipe)) > 0;) out.append(buffer, n);
-  int status = ::pclose(pipe);
-  return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, out};
-}
+Outcome run(const std::string& command_line) { return testing_support::runCommand(command_line); }
 
 Outcome mirvae(const std::string& args) { return run(std::string("'") + MIRVAE_BINARY + "' " + args); }
 
@@ -572,13 +559,7 @@ TEST_F(MirvaeRunTest, PrintWritesTheFormOrTheListAsAPdfFileAndNamesIt) {
     EXPECT_EQ(printed.status, c.status) << printed.out;
     EXPECT_NE(printed.out.find(c.said), std::string::npos) << printed.out;
     if (c.text.empty()) continue;
-    std::string text = run("pdftotext -layout " + quote(other_) + " -").out;
-    std::size_t at = 0;
-    for (const std::string& wanted : c.text) {
-      std::size_t found = text.find(wanted, at);
-      EXPECT_NE(found, std::string::npos) << wanted << " in\n" << text;
-      if (found != std::string::npos) at = found + wanted.size();
-    }
+    EXPECT_TRUE(testing_support::inOrder(run("pdftotext -layout " + quote(other_) + " -").out, c.text));
   }
   EXPECT_TRUE(std::filesystem::exists(folder + "/fiche1-001.pdf"));
 

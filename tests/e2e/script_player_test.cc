@@ -136,28 +136,50 @@ close
   EXPECT_LT(out_.find("-- salut"), out_.find("[message] Bonjour"));
 }
 
-TEST_F(ScriptPlayerTest, AFailingExpectationStopsTheScriptAtItsLine) {
-  const std::pair<const char*, const char*> cases[] = {
-      {"expect message \"Bonjour Bob\"", "aucun message « Bonjour Bob » depuis la dernière action ; messages : « Bonjour Ana »"},
-      {"expect message containing Bob", "aucun message contenant « Bob »"},
-      {"expect error containing panne", "aucune erreur contenant « panne » depuis la dernière action ; aucune erreur montrée"},
-      {"expect question Q", "aucune question « Q »"},
-      {"expect value VNOM Bob", "VNOM vaut « Ana », attendu « Bob »"},
-      {"expect refused", "la dernière action a été acceptée"},
-      {"expect screen ESSAI-MODALE", "l'écran devant est « ESSAI-SCRIPT »"},
-      {"expect sql \"SELECT count(*) FROM PIECE\" = 99", "la requête donne « 0 », attendu « 99 »"},
-      {"expect sql \"SELECT 1\" != 1.0", "la requête donne « 1 »"},
-      {"expect sql \"DELETE FROM COMPT\" = 0", "une requête de script ne fait que lire le dossier"},
-      {"expect sql \"SELECT 1; DELETE FROM COMPT\" = 1", "une seule requête par ligne"},
-      {"expect sql \"SELECT nothing FROM nowhere\" = 1", "requête refusée par la base"},
-      {"type VINCONNU x", "VINCONNU"},
+// Expectations on the last action, the messages, the dossier, a list and inside a
+// modal screen: each failing one stops the script at its line, saying why.
+TEST_F(ScriptPlayerTest, AScriptStopsAtTheLineThatFailsSayingWhy) {
+  struct Case {
+    std::string script, why, where = "";
   };
-  for (const auto& [line, why] : cases) {
-    int rc = jouer("open ESSAI-SCRIPT\ntype VNOM Ana\n\n" + std::string(line) + "\nsay \"jamais joué\"\n");
-    EXPECT_EQ(rc, 1) << line;
-    EXPECT_NE(out_.find("essai.txt:4: " + std::string(line) + " : "), std::string::npos) << out_;
-    EXPECT_NE(out_.find(why), std::string::npos) << line << "\n" << out_;
-    EXPECT_EQ(out_.find("jamais joué"), std::string::npos) << line;
+  // After greeting Ana, line 4 fails.
+  auto afterAna = [](const std::string& line, const std::string& why) {
+    return Case{"open ESSAI-SCRIPT\ntype VNOM Ana\n\n" + line + "\n", why, "essai.txt:4: " + line + " : "};
+  };
+  const Case cases[] = {
+      afterAna("expect message \"Bonjour Bob\"",
+               "aucun message « Bonjour Bob » depuis la dernière action ; messages : « Bonjour Ana »"),
+      afterAna("expect message containing Bob", "aucun message contenant « Bob »"),
+      afterAna("expect error containing panne",
+               "aucune erreur contenant « panne » depuis la dernière action ; aucune erreur montrée"),
+      afterAna("expect question Q", "aucune question « Q »"),
+      afterAna("expect value VNOM Bob", "VNOM vaut « Ana », attendu « Bob »"),
+      afterAna("expect refused", "la dernière action a été acceptée"),
+      afterAna("expect screen ESSAI-MODALE", "l'écran devant est « ESSAI-SCRIPT »"),
+      afterAna("expect sql \"SELECT count(*) FROM PIECE\" = 99", "la requête donne « 0 », attendu « 99 »"),
+      afterAna("expect sql \"SELECT 1\" != 1.0", "la requête donne « 1 »"),
+      afterAna("expect sql \"DELETE FROM COMPT\" = 0", "une requête de script ne fait que lire le dossier"),
+      afterAna("expect sql \"SELECT 1; DELETE FROM COMPT\" = 1", "une seule requête par ligne"),
+      afterAna("expect sql \"SELECT nothing FROM nowhere\" = 1", "requête refusée par la base"),
+      afterAna("type VINCONNU x", "VINCONNU"),
+      {"open ESSAI-SCRIPT\npress ECHOUER\nexpect accepted\n",
+       "essai.txt:3: expect accepted : la dernière action a été refusée : « ECHOUER : panne voulue »"},
+      {"open ESSAI-SCRIPT\npress ECHOUER\nexpect refused\n",
+       "essai.txt:3: expect refused : la dernière action a échoué sans refus : « "},
+      {"expect accepted\n", "essai.txt:1: expect accepted : aucune action n'a encore été jouée"},
+      {"open ESSAI-SCRIPT\ntype VNOM personne\nexpect refused VNOMS\n", "aucun refus sur VNOMS"},
+      {"open ESSAI-SCRIPT\npress MODALE\nexpect value VVAL y\nclose\n",
+       "essai.txt:3: expect value VVAL y : VVAL vaut «  », attendu « y »"},
+      {"open ESSAI-BANQUES\nexpect row 3 NUMCP 512300\n",
+       "essai.txt:2: expect row 3 NUMCP 512300 : la liste n'a que 2 lignes"},
+      {"open ESSAI-BANQUES\nexpect row 1 NUMCPX 512100\n", "pas de colonne NUMCPX ; colonnes : "},
+      {"open ESSAI-BANQUES\nexpect row containing 411\n", "aucune des 2 lignes de la liste ne contient « 411 »"},
+  };
+  for (const Case& c : cases) {
+    EXPECT_EQ(jouer(c.script + "say \"jamais joué\"\n"), 1) << c.script;
+    EXPECT_NE(out_.find(c.why), std::string::npos) << c.script << "\n" << out_;
+    EXPECT_NE(out_.find(c.where), std::string::npos) << c.script << "\n" << out_;
+    EXPECT_EQ(out_.find("jamais joué"), std::string::npos) << c.script;
   }
   // A script query never changed the dossier.
   EXPECT_NE(sql("SELECT count(*) FROM COMPT"), "0");
@@ -295,30 +317,6 @@ press VOIR
 expect message "Compte 512200"
 )");
   EXPECT_EQ(rc, 0) << out_;
-}
-
-// Expectations on the last action, on a list and inside a modal screen: each stops the
-// script at its line, saying why.
-TEST_F(ScriptPlayerTest, AScriptStopsAtTheLineThatFailsSayingWhy) {
-  const std::pair<const char*, const char*> cases[] = {
-      {"open ESSAI-SCRIPT\npress ECHOUER\nexpect accepted\n",
-       "essai.txt:3: expect accepted : la dernière action a été refusée : « ECHOUER : panne voulue »"},
-      {"open ESSAI-SCRIPT\npress ECHOUER\nexpect refused\n",
-       "essai.txt:3: expect refused : la dernière action a échoué sans refus : « "},
-      {"expect accepted\n", "essai.txt:1: expect accepted : aucune action n'a encore été jouée"},
-      {"open ESSAI-SCRIPT\ntype VNOM personne\nexpect refused VNOMS\n", "aucun refus sur VNOMS"},
-      {"open ESSAI-SCRIPT\npress MODALE\nexpect value VVAL y\nclose\n",
-       "essai.txt:3: expect value VVAL y : VVAL vaut «  », attendu « y »"},
-      {"open ESSAI-BANQUES\nexpect row 3 NUMCP 512300\n",
-       "essai.txt:2: expect row 3 NUMCP 512300 : la liste n'a que 2 lignes"},
-      {"open ESSAI-BANQUES\nexpect row 1 NUMCPX 512100\n", "pas de colonne NUMCPX ; colonnes : "},
-      {"open ESSAI-BANQUES\nexpect row containing 411\n", "aucune des 2 lignes de la liste ne contient « 411 »"},
-  };
-  for (const auto& [script, why] : cases) {
-    EXPECT_EQ(jouer(std::string(script) + "say \"jamais joué\"\n"), 1) << script;
-    EXPECT_NE(out_.find(why), std::string::npos) << script << "\n" << out_;
-    EXPECT_EQ(out_.find("jamais joué"), std::string::npos) << script;
-  }
 }
 
 TEST_F(ScriptPlayerTest, TodaySetsTheHostClock) {

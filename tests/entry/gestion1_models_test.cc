@@ -145,32 +145,19 @@ TEST_F(ModelesTest, TheNextPieceOfAChainStartsFromTheSameModel) {
 
 class DuplicationTest : public Gestion1Test {
  protected:
-  // A saved client invoice in dollars at `rate`, one line on 706000 with its
-  // analytic rows (credits), as an earlier session left it.
+  // The fixture's saved invoice turned into one in dollars at `rate`, of one line on
+  // 706000 (00000500L1) with its analytic rows (credits).
   void operationEnDollars(const std::string& rate, const std::string& ht, const std::string& tva,
                           const std::vector<std::string>& analytic) {
-    host::Statement& s = base().prepare(
-        "INSERT INTO MIRVAE (IDENT, TYPE, DTOPE, NUMCP, NUMJL, NPIEC, INPIE, MONNAIE_IDENT, COURS, DTECH, SAISIE_MTT) "
-        "VALUES ('00000500', 'FC', '2024-03-10', '411006', 'VT', 'VT9', 'Facture client n° VT9', 'USD', ?, "
-        "'2024-03-10', '1')");
-    s.bind(1, std::stod(rate));
-    s.step();
-    s.reset();
-    host::Statement& l = base().prepare(
-        "INSERT INTO MIRVAL (IDENT, NUMERO, NUMCP, LIBEC, COTVA, TXTVA, HT, TVA, TTC, CPOST, MOUVE_UNIQ) VALUES "
-        "('00000501', '00000500|000001', '706000', 'Pose', 'V20', 20, ?, ?, ?, 'PROD', 77)");
-    host::Decimal ttc = *host::Decimal::parse(ht) + *host::Decimal::parse(tva);
-    l.bind(1, ht).bind(2, tva).bind(3, ttc.toString(0));
-    l.step();
-    l.reset();
+    operationEnregistree("00000500");
+    sql("UPDATE MIRVAE SET NUMCP = '411006', NPIEC = 'VT9', MONNAIE_IDENT = 'USD', COURS = " + rate);
+    sql("DELETE FROM MIRVAL WHERE IDENT = '00000500L2'");
+    sql("UPDATE MIRVAL SET NUMCP = '706000', LIBEC = 'Pose', CPOST = 'PROD', MOUVE_UNIQ = 77, HT = '" + ht +
+        "', TVA = '" + tva + "', TTC = '" + (*host::Decimal::parse(ht) + *host::Decimal::parse(tva)).toString(0) + "'");
     const char* sections[] = {"ATELIER", "CHANTIER", "ADMIN"};
-    for (std::size_t i = 0; i < analytic.size(); ++i) {
-      host::Statement& a = base().prepare(
-          "INSERT INTO MIRVAANA (IDENT, NUMERO, CSECT, MTADE, MTACR) VALUES (?, '00000501|', ?, '0', ?)");
-      a.bind(1, "0000060" + std::to_string(i)).bind(2, std::string(sections[i])).bind(3, analytic[i]);
-      a.step();
-      a.reset();
-    }
+    for (std::size_t i = 0; i < analytic.size(); ++i)
+      sql("INSERT INTO MIRVAANA (IDENT, NUMERO, CSECT, MTADE, MTACR) VALUES ('0000060" + std::to_string(i) +
+          "', '00000500L1|', '" + sections[i] + "', '0', '" + analytic[i] + "')");
   }
 };
 
@@ -210,7 +197,7 @@ TEST_F(DuplicationTest, ACopyAtTheNewRateScalesEveryAmountAndGetsNewIdentifiers)
               std::string("1.105 ") + c.line);
     std::string line = sql("SELECT IDENT FROM MIRVAL WHERE NUMERO LIKE '" + copy + "|%'");
     EXPECT_EQ(line.size(), 8u);
-    EXPECT_NE(line, "00000501");
+    EXPECT_NE(line, "00000500L1");
     EXPECT_EQ(sql("SELECT HT || ' ' || TVA || ' ' || TTC || ' ' || LIBEC || ' ' || CPOST FROM MIRVAL WHERE IDENT = '" +
                   line + "'"),
               std::string(c.line) + " Pose PROD");
@@ -218,13 +205,13 @@ TEST_F(DuplicationTest, ACopyAtTheNewRateScalesEveryAmountAndGetsNewIdentifiers)
                   "|' ORDER BY CSECT)"),
               c.rows);
     EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAANA WHERE NUMERO = '" + line +
-                     "|' AND IDENT IN (SELECT IDENT FROM MIRVAANA WHERE NUMERO = '00000501|')"),
+                     "|' AND IDENT IN (SELECT IDENT FROM MIRVAANA WHERE NUMERO = '00000500L1|')"),
               0);
     EXPECT_EQ(nombre("SELECT count(DISTINCT IDENT) FROM MIRVAANA WHERE NUMERO = '" + line + "|'"),
               static_cast<long long>(c.analytic.size()));
     // The source keeps its own.
-    EXPECT_EQ(sql("SELECT HT FROM MIRVAL WHERE IDENT = '00000501'"), c.ht);
-    EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAANA WHERE NUMERO = '00000501|'"),
+    EXPECT_EQ(sql("SELECT HT FROM MIRVAL WHERE IDENT = '00000500L1'"), c.ht);
+    EXPECT_EQ(nombre("SELECT count(*) FROM MIRVAANA WHERE NUMERO = '00000500L1|'"),
               static_cast<long long>(c.analytic.size()));
     model::fermer(session());
   }

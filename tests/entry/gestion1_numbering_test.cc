@@ -95,7 +95,9 @@ TEST_F(NumerotationTest, CounterNotUpdatedWarnsAndKeepsTheNumber) {
   EXPECT_EQ(valeur("MIRVAE.NPIEC"), "VT1");
 }
 
-TEST_F(NumerotationTest, CounterHeldByAnotherProcessRefusesTheNumber) {
+// Error 1 of the counter, the number drawn but not written, is a warning; error 2,
+// the counter held by another process outside any action of this one, draws nothing.
+TEST_F(NumerotationTest, CounterHeldByAnotherProcessRefusesTheNumberAndLeavesTheCounter) {
   ASSERT_TRUE(creer());
   ASSERT_TRUE(client());
   // Another process holds the dossier while the number is asked for outside any
@@ -110,6 +112,11 @@ TEST_F(NumerotationTest, CounterHeldByAnotherProcessRefusesTheNumber) {
   EXPECT_EQ(screen.ecran()->focus(), "NPIEC");
   EXPECT_EQ(dernierMessage(), "La numérotation automatique de la pièce@est déjà réservée...Recommencez");
   EXPECT_EQ(valeur("MIRVAE.NPIEC"), "[PIECE]");
+  EXPECT_EQ(compteur("202403"), "");
+  EXPECT_EQ(base().profondeur(), 0);
+  // Once the other process let go, the number is drawn from where the counter stood.
+  ASSERT_TRUE(model::nouvelleLigne(session()));
+  EXPECT_EQ(valeur("MIRVAE.NPIEC"), "VT1");
 }
 
 }  // namespace

@@ -36,7 +36,6 @@ struct Lanceur : model::Traitmnt {
   explicit Lanceur(Evt* e) : Traitmnt(e) {
     addBranch("AGIR", &Lanceur::agir);
     addBranch("PLUS_TARD", &Lanceur::plus_tard);
-    addBranch("REFUSER", &Lanceur::refuser);
     addBranch("CASSER", &Lanceur::casser);
   }
   void agir(Evt*) {
@@ -44,7 +43,6 @@ struct Lanceur : model::Traitmnt {
     journal.push_back("agir fin");
   }
   void plus_tard(Evt*) { journal.push_back("plus tard"); }
-  void refuser(Evt* e) { rejeter(e); }
   void casser(Evt*) { throw HostError("panne voulue"); }
 };
 
@@ -64,20 +62,17 @@ class AutomateTest : public testing_support::DossierTest {
   AutomatePtr lanceur_;
 };
 
-TEST_F(AutomateTest, ReferenceParameterWrittenByCalleeIsReadByCaller) {
-  auto& l = static_cast<Lanceur&>(*lanceur_);
-  EvtParamRef evt(1, &l.VALEUR);
-  l.appelerProcedure("*", "TEST", "APPELE", "ECRIRE", &evt, -1);
-  EXPECT_EQ(l.VALEUR, "écrit par l'appelé");
-  EXPECT_EQ(l.erreurMethode(), 1);
-}
-
-TEST_F(AutomateTest, ValueParameterIsACopy) {
+// A reference parameter is the caller's variable; a value parameter, a copy of it.
+TEST_F(AutomateTest, TheCalleeWritesThroughAReferenceParameterAndNeverThroughAValue) {
   auto& l = static_cast<Lanceur&>(*lanceur_);
   l.VALEUR = "original";
-  EvtParamVal evt(1, &l.VALEUR);
-  l.appelerProcedure("*", "TEST", "APPELE", "ECRIRE", &evt, -1);
+  EvtParamVal byValue(1, &l.VALEUR);
+  l.appelerProcedure("*", "TEST", "APPELE", "ECRIRE", &byValue, -1);
   EXPECT_EQ(l.VALEUR, "original");
+  EvtParamRef byReference(1, &l.VALEUR);
+  l.appelerProcedure("*", "TEST", "APPELE", "ECRIRE", &byReference, -1);
+  EXPECT_EQ(l.VALEUR, "écrit par l'appelé");
+  EXPECT_EQ(l.erreurMethode(), 1);
 }
 
 TEST_F(AutomateTest, QueuedProcedureRunsAfterItsCallersHandler) {
@@ -89,13 +84,6 @@ TEST_F(AutomateTest, ModuleCalledByNameRunsToItsEnd) {
   session().action([&] { lanceur_->appelerModule("", "TEST", "APPELE", nullptr); });
   EXPECT_EQ(journal, (std::vector<std::string>{"appelé DEBUT", "appelé FAIRE"}));
   EXPECT_EQ(session().transcript().textes("ferme"), std::vector<std::string>{"TEST-APPELE"});
-}
-
-TEST_F(AutomateTest, RefusedEventIsMarked) {
-  EvtParamVal evt(new InfoCode(0, 0, 0, 0, 0, 0));
-  lanceur_->executer("REFUSER", &evt);
-  EXPECT_TRUE(evt.rejete());
-  EXPECT_TRUE(lanceur_->refuse());
 }
 
 TEST_F(AutomateTest, HostErrorIsStampedWithItsEventAndUndoesTheAction) {
@@ -133,13 +121,6 @@ TEST_F(AutomateTest, BadNamesAndIndexesAreClearErrors) {
   } catch (const HostError& e) {
     EXPECT_NE(std::string(e.what()).find("paramètre 1"), std::string::npos);
   }
-}
-
-TEST(Registre, ResolvesLibraryAndModuleToItsRegistryName) {
-  EXPECT_EQ(Registre::nomModule("", "MIRVAE", "GESTION1"), "MIRVAE-GESTION1");
-  EXPECT_EQ(Registre::nomModule("*", "CPMESSAG", "INTERFACE"), "CPMESSAG-INTERFACE");
-  EXPECT_EQ(Registre::nomModule("ZEFMDS", "$$", "NETTOYAGE_PARAMLST1_LISTE"), "ZEFMDS-NETTOYAGE_PARAMLST1_LISTE");
-  EXPECT_EQ(Registre::nomModule("", "", "AGIR"), "AGIR");
 }
 
 // A long session keeps only its recent entries, numbered from its first one, so that

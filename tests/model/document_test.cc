@@ -303,7 +303,7 @@ TEST_F(DocumentCycleTest, AnotherKindOrAMissingDocumentIsNeverShown) {
                                       "La fiche « ZZ » est introuvable."}));
 }
 
-TEST_F(DocumentCycleTest, VisualisationRefusesEveryChange) {
+TEST_F(DocumentCycleTest, VisualisationRefusesEveryChangeAndAHandlerMayAskForIt) {
   documentEnregistre();
   ASSERT_TRUE(ouvrirDocument("D1", "Vv"));
   EXPECT_EQ(document().modeCourant(), "V");
@@ -315,10 +315,8 @@ TEST_F(DocumentCycleTest, VisualisationRefusesEveryChange) {
   EXPECT_FALSE(model::appuyer(session(), "SUPPRESSION"));
   EXPECT_FALSE(model::appuyer(session(), "VALID_DOC"));
   EXPECT_EQ(sql("SELECT NUMCP FROM MIRVAE WHERE IDENT = 'D1'"), "411001");
-}
+  model::fermer(session());
 
-TEST_F(DocumentCycleTest, AHandlerAskingForVisualisationSwitchesTheDocument) {
-  documentEnregistre();
   consignes.visuSurModification = true;
   ASSERT_TRUE(ouvrirDocument("D1", "VMCAm"));
   EXPECT_EQ(document().modeCourant(), "V");
@@ -344,22 +342,7 @@ TEST_F(DocumentCycleTest, DeletionNeedsItsStepAndTakesHeaderAndLines) {
   EXPECT_EQ(session().ecranCourant(), nullptr);
 }
 
-TEST_F(DocumentCycleTest, AbandonDropsTheChangesSinceTheLastSave) {
-  documentEnregistre();
-  ouvrirDocument("D1", "VMCAm");
-  model::allerLigne(session(), 2);
-  model::supprimerLigne(session());
-  saisirLigne("706500", "1");
-  journal.clear();
-  ASSERT_TRUE(model::appuyer(session(), "ABAND_DOC"));
-  EXPECT_EQ(journal.back(), "APRES_ABANDON");
-  auto rows = model::lignes(session());
-  ASSERT_EQ(rows.size(), 2u);
-  EXPECT_EQ(rows[1].at("NUMCP"), "706200");
-  EXPECT_EQ(lignesDe("D1"), "D1|000001 706100 10.00, D1|000002 706200 20.00");
-}
-
-TEST_F(DocumentCycleTest, AbandoningALineDropsItAndKeepsTheOthers) {
+TEST_F(DocumentCycleTest, AbandoningALineDropsItAndAbandoningTheDocumentDropsTheChangesSinceTheLastSave) {
   documentEnregistre();
   ouvrirDocument("D1", "VMCAm");
   model::allerLigne(session(), 1);
@@ -370,6 +353,17 @@ TEST_F(DocumentCycleTest, AbandoningALineDropsItAndKeepsTheOthers) {
   model::abandonnerLigne(session());
   EXPECT_EQ(model::lignes(session()).size(), 2u);
   EXPECT_FALSE(document().lineInEntry());
+
+  model::allerLigne(session(), 2);
+  model::supprimerLigne(session());
+  saisirLigne("706500", "1");
+  journal.clear();
+  ASSERT_TRUE(model::appuyer(session(), "ABAND_DOC"));
+  EXPECT_EQ(journal.back(), "APRES_ABANDON");
+  auto rows = model::lignes(session());
+  ASSERT_EQ(rows.size(), 2u);
+  EXPECT_EQ(rows[1].at("NUMCP"), "706200");
+  EXPECT_EQ(lignesDe("D1"), "D1|000001 706100 10.00, D1|000002 706200 20.00");
 }
 
 TEST_F(DocumentCycleTest, AHandlerPutsTheCurrentLineIntoModification) {

@@ -18,32 +18,11 @@ namespace {
 
 using host::Chaine;
 using model::valueOf;
-
-// What a command printed on its standard output.
-std::string output(const std::string& command) {
-  std::string out;
-  FILE* pipe = ::popen(command.c_str(), "r");
-  if (!pipe) return out;
-  char buffer[4096];
-  for (std::size_t n; (n = std::fread(buffer, 1, sizeof buffer, pipe)) > 0;) out.append(buffer, n);
-  ::pclose(pipe);
-  return out;
-}
+using testing_support::inOrder;
 
 std::string withoutBlanks(std::string text) {
   text.erase(std::remove_if(text.begin(), text.end(), [](unsigned char c) { return std::isspace(c); }), text.end());
   return text;
-}
-
-// True when each text is found after the one before it.
-::testing::AssertionResult inOrder(const std::string& text, const std::vector<std::string>& wanted) {
-  std::size_t at = 0;
-  for (const std::string& w : wanted) {
-    std::size_t found = text.find(w, at);
-    if (found == std::string::npos) return ::testing::AssertionFailure() << "« " << w << " » missing or out of order in:\n" << text;
-    at = found + w.size();
-  }
-  return ::testing::AssertionSuccess();
 }
 
 class ImprTest : public testing_support::DossierTest {
@@ -90,7 +69,7 @@ class ImprTest : public testing_support::DossierTest {
   }
   const model::Impression& printed() { return model::Imprimante::courante().derniere(); }
   std::string pdfText(const char* options = "-layout") {
-    return output(std::string("pdftotext ") + options + " '" + pdf_ + "' -");
+    return testing_support::runCommand("{ pdftotext " + std::string(options) + " '" + pdf_ + "' - 2>/dev/null; }").out;
   }
 
   std::string pdf_;
@@ -295,7 +274,7 @@ TEST_F(ImprTest, ALongListRepeatsItsHeadingsOnEveryPageAndRenders) {
   EXPECT_TRUE(inOrder(text, {"Facture n° 1998", "Facture n° 1999", "Total", "0,00"}));
   // Every page renders.
   std::string images = testing_support::cheminTemporaire("mirvae-pages");
-  output("pdftoppm -r 20 -png '" + pdf_ + "' '" + images + "'");
+  testing_support::runCommand("pdftoppm -r 20 -png '" + pdf_ + "' '" + images + "'");
   std::size_t rendered = 0;
   for (const auto& entry : std::filesystem::directory_iterator(std::filesystem::path(images).parent_path()))
     if (entry.path().filename().string().rfind(std::filesystem::path(images).filename().string() + "-", 0) == 0) {

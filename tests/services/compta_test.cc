@@ -147,32 +147,6 @@ TEST_F(ComptaTest, PieceCounterRefusesUnknownJournalsAndKeys) {
   EXPECT_EQ(sql("SELECT count(*) FROM NUMPI"), "0");
 }
 
-// Error 1, the number drawn but the counter not written, is the entry screen's warning.
-// Error 2: another process holds the dossier while the counter is asked for outside
-// any unit of work; nothing is drawn and the counter stays as it was.
-TEST_F(ComptaTest, CounterHeldByAnotherProcessGivesErrorTwoAndStaysUntouched) {
-  tirer("VT", "N");
-  auto other = Database::ouvrir(path_);
-  other->exec("BEGIN IMMEDIATE");
-  other->exec("UPDATE NUMPI SET NUMERO = NUMERO WHERE NUMJL = 'VT'");
-  Chaine numjl, cle;
-  numjl = "VT";
-  cle = "N";
-  Double number(-1);
-  Entier error(-1);
-  EvtParamRef evt(4, &numjl, &cle, &number, &error);
-  appelant_->appelerProcedure("COMPTA", "COMPTA", "MOD_CAL_BIBLIOPROC", "INCREMENTE_NUMERO_PIECE", &evt, -1);
-  EXPECT_EQ(error.entier(), 2);
-  EXPECT_EQ(number.entier(), -1);
-  other->exec("ROLLBACK");
-  EXPECT_EQ(compteur("VT", "N"), "1");
-  EXPECT_EQ(base().profondeur(), 0);
-  appelant_->appelerProcedure("COMPTA", "COMPTA", "MOD_CAL_BIBLIOPROC", "INCREMENTE_NUMERO_PIECE", &evt, -1);
-  EXPECT_EQ(error.entier(), 0);
-  EXPECT_EQ(number.entier(), 2);
-  EXPECT_EQ(compteur("VT", "N"), "2");
-}
-
 TEST_F(ComptaTest, PrefixIsBuiltFromThePatternAndTheYearMonth) {
   struct Case {
     const char* pattern;

@@ -1,7 +1,10 @@
 #include "tests/support/fixture.h"
 
-#include <atomic>
+#include <sys/wait.h>
 #include <unistd.h>
+
+#include <atomic>
+#include <cstdio>
 
 #include "app/script.h"
 
@@ -17,6 +20,40 @@ std::string cheminTemporaire(const std::string& stem) {
                            .string();
     if (!std::filesystem::exists(path) && !std::filesystem::exists(path + "-wal")) return path;
   }
+}
+
+CommandResult runCommand(const std::string& command_line) {
+  std::string command = command_line + " 2>&1";
+  FILE* pipe = ::popen(command.c_str(), "r");
+  if (!pipe) return {-1, "popen"};
+  std::string out;
+  char buffer[4096];
+  for (std::size_t n; (n = std::fread(buffer, 1, sizeof buffer, pipe)) > 0;) out.append(buffer, n);
+  int status = ::pclose(pipe);
+  return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, out};
+}
+
+::testing::AssertionResult inOrder(const std::string& text, const std::vector<std::string>& wanted) {
+  std::size_t at = 0;
+  for (const std::string& w : wanted) {
+    std::size_t found = text.find(w, at);
+    if (found == std::string::npos)
+      return ::testing::AssertionFailure() << "« " << w << " » missing or out of order in:\n" << text;
+    at = found + w.size();
+  }
+  return ::testing::AssertionSuccess();
+}
+
+ModuleStandIn::ModuleStandIn(const std::string& name, host::Fabrique factory) : name_(name) {
+  app::chargerModules();  // the library's own modules first, or they would come after the stand-in
+  if (host::Registre::instance().module(name))
+    kept_ = host::Registre::instance().substituer(name, factory);
+  else
+    host::Module("", name_.c_str(), factory, false, "");
+}
+
+ModuleStandIn::~ModuleStandIn() {
+  if (kept_) host::Registre::instance().substituer(name_, kept_);
 }
 
 std::vector<std::string> incoherences(host::Database& db) {

@@ -38,6 +38,32 @@ std::vector<std::string> incoherences(host::Database& db);
 // A unique file name in the temporary directory.
 std::string cheminTemporaire(const std::string& stem);
 
+// What a shell command printed, standard output and error together, and its exit
+// status (-1 when it did not exit).
+struct CommandResult {
+  int status;
+  std::string out;
+};
+CommandResult runCommand(const std::string& command_line);
+
+// True when each of `wanted` is found in `text` after the one before it.
+::testing::AssertionResult inOrder(const std::string& text, const std::vector<std::string>& wanted);
+
+// While it lives, `name` builds `factory`'s automaton; then the name builds what it
+// built before. A name not yet registered keeps the stand-in for good, as the
+// registry outlives the test.
+class ModuleStandIn {
+ public:
+  ModuleStandIn(const std::string& name, host::Fabrique factory);
+  ~ModuleStandIn();
+  ModuleStandIn(const ModuleStandIn&) = delete;
+  ModuleStandIn& operator=(const ModuleStandIn&) = delete;
+
+ private:
+  std::string name_;
+  host::Fabrique kept_ = nullptr;
+};
+
 class DossierTest : public ::testing::Test {
  protected:
   void SetUp() override;
