@@ -268,6 +268,10 @@ std::vector<std::string> fieldsOf(host::Automate& screen) {
   if (host::Table* main = screen.table(false); main && !main->nom().empty())
     for (const host::Colonne& c : main->colonnes()) names.push_back(main->alias() + "." + c.name);
   for (const host::Donnee* d : screen.variables()) names.push_back(d->nom());
+  // The fields of a document's current line, as its list names them ("LST_MIRVAL.NUMCP").
+  if (auto* document = dynamic_cast<model::Sdocum*>(&screen); document && document->lineTable())
+    for (const host::Colonne& c : document->lineTable()->colonnes())
+      names.push_back(document->listName() + "_" + document->lineTable()->alias() + "." + c.name);
   return names;
 }
 
@@ -331,7 +335,10 @@ json screensState(host::Session& session) {
                        {"complete", list->complete()},
                        {"choisie", list->selectedRow()}};
   } else if (auto* document = dynamic_cast<model::Sdocum*>(front)) {
-    screen["liste"] = {{"sorte", "lignes"}, {"nom", document->listName()}, {"lignes", rowsJson(document->rows())}};
+    screen["liste"] = {{"sorte", "lignes"},
+                       {"nom", document->listName()},
+                       {"lignes", rowsJson(document->rows())},
+                       {"courante", document->currentLine()}};
   } else if (auto* list = dynamic_cast<model::FreeList*>(front)) {
     screen["liste"] = {{"sorte", "libre"}, {"nom", list->listName()}, {"lignes", rowsJson(list->rows())}};
   }

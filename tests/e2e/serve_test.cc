@@ -213,7 +213,8 @@ TEST_F(ServeTest, TheAnalyticBreakdownIsWorkedOnItsModalScreenAndLandsOnlyWithTh
                           [](const json& a) { return a["nom"] == "VALID_DOC"; }));
 
   // The person shares the wood evenly, one gesture after the other; the page sends
-  // what was done on the screen so far, and drops a refused gesture.
+  // what was done on the screen so far, drops a refused gesture, and answers a
+  // choice window opened on the screen after the screen's entry.
   const json typed = {{{"geste", "aller_ligne"}, {"ligne", 1}},
                       {{"geste", "saisir"}, {"objet", "LST_V_MTANA"}, {"texte", "1200"}},
                       {{"geste", "valider_ligne"}},
@@ -221,30 +222,44 @@ TEST_F(ServeTest, TheAnalyticBreakdownIsWorkedOnItsModalScreenAndLandsOnlyWithTh
                       {{"geste", "saisir"}, {"objet", "LST_V_MTANA"}, {"texte", "1200"}},
                       {{"geste", "valider_ligne"}}};
   const json validate = {{"geste", "appuyer"}, {"objet", "VALID_DOC"}}, close = {{"geste", "fermer"}};
+  const json pick = {{"geste", "nouvelle_ligne"}}, window = {{"geste", "choix"}, {"objet", "LST_MIRVAANA_M01.CSECT"}};
+  auto onScreen = [](std::vector<json> gestes) { return json{{"sorte", "ecran"}, {"gestes", gestes}}; };
   const struct {
-    std::vector<json> gestes;
-    json refus;            // the gesture refused, null when none
-    std::string reste;     // what remains to spread, as the modal screen shows it; "" when it closed
-    std::string message;   // in the journal
+    json reponses;
+    std::string attente;                       // what the action then waits for; "" when it ran to its end
+    int rang;
+    json refus;                                // the gesture refused, null when none
+    std::pair<std::string, std::string> shown;  // on the modal screen
+    std::string message;                       // in the journal
   } steps[] = {
-      {{typed[0], typed[1], typed[2], validate}, 3, "240.00", "Le total ventilé est différent du montant du mouvement"},
-      {{typed[0], typed[1], typed[2], typed[3], typed[4], typed[5]}, nullptr, "0.00", ""},
-      {{typed[0], typed[1], typed[2], typed[3], typed[4], typed[5], validate, close}, nullptr, "", ""},
+      {{onScreen({typed[0], typed[1], typed[2], validate})}, "ecran", 0, 3, {"V_RESTE_ANA", "240.00"},
+       "Le total ventilé est différent du montant du mouvement"},
+      {{onScreen({pick, window})}, "choix", 1, nullptr, {}, ""},
+      {{onScreen({pick, window}), {{"sorte", "choix"}, {"valeur", "ADMIN"}}}, "ecran", 0, nullptr,
+       {"LST_MIRVAANA_M01.CSECT", "ADMIN"}, ""},
+      {{onScreen({typed[0], typed[1], typed[2], typed[3], typed[4], typed[5]})}, "ecran", 0, nullptr,
+       {"V_RESTE_ANA", "0.00"}, ""},
+      {{onScreen({typed[0], typed[1], typed[2], typed[3], typed[4], typed[5], validate, close})}, "", 0, nullptr, {},
+       ""},
   };
   for (const auto& step : steps) {
     json request = press;
-    request["reponses"] = {{{"sorte", "ecran"}, {"gestes", step.gestes}}};
+    request["reponses"] = step.reponses;
     json r = geste(id, request);
-    SCOPED_TRACE(r.dump());
+    SCOPED_TRACE(request.dump() + "\n" + r.dump());
     EXPECT_NE(r["journal"].dump().find(step.message), std::string::npos);
-    if (step.reste.empty()) {
+    if (step.attente.empty()) {
       EXPECT_TRUE(r["accepte"]);
       EXPECT_TRUE(r["attente"].is_null());
       EXPECT_EQ(r["ecran"]["code"], "MIRVAE-GESTION2");
       continue;
     }
-    EXPECT_EQ(r["attente"]["refus"], step.refus);
-    EXPECT_EQ(valeur(r["attente"]["etat"], "V_RESTE_ANA"), step.reste);
+    EXPECT_EQ(r["attente"]["sorte"], step.attente);
+    EXPECT_EQ(r["attente"]["rang"], step.rang);
+    if (!step.shown.first.empty()) {
+      EXPECT_EQ(r["attente"]["refus"], step.refus);
+      EXPECT_EQ(valeur(r["attente"]["etat"], step.shown.first), step.shown.second);
+    }
     nothingInTheDossier();
   }
   // A modal gesture the screen does not know is the page's mistake.
