@@ -8,8 +8,8 @@
 #include <filesystem>
 #include <fstream>
 #include <functional>
-#include <limits>
 #include <future>
+#include <limits>
 #include <map>
 #include <mutex>
 #include <nlohmann/json.hpp>
@@ -70,11 +70,11 @@ std::string text(const json& request, const char* key) {
 
 int number(const json& request, const char* key) {
   const json* n = request.contains(key) ? &request[key] : nullptr;
-  bool fits = n && ((n->is_number_unsigned() && n->get<std::uint64_t>() <= std::numeric_limits<int>::max()) ||
-                    (n->is_number_integer() && !n->is_number_unsigned() &&
-                     n->get<std::int64_t>() >= std::numeric_limits<int>::min() &&
-                     n->get<std::int64_t>() <= std::numeric_limits<int>::max()));
-  if (!fits) throw BadRequest(std::string("« ") + key + " » manque ou n'est pas un entier");
+  constexpr auto kLeast = std::numeric_limits<int>::min(), kMost = std::numeric_limits<int>::max();
+  if (!n || !n->is_number_integer() ||
+      (n->is_number_unsigned() ? n->get<std::uint64_t>() > std::uint64_t(kMost)
+                               : n->get<std::int64_t>() < kLeast || n->get<std::int64_t>() > kMost))
+    throw BadRequest(std::string("« ") + key + " » manque ou n'est pas un entier");
   return n->get<int>();
 }
 
