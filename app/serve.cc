@@ -2,6 +2,7 @@
 
 #include <httplib.h>
 
+#include <atomic>
 #include <chrono>
 #include <condition_variable>
 #include <deque>
@@ -501,6 +502,7 @@ struct Serveur::Impl {
   ServeOptions options;
   httplib::Server http;
   int port = 0;
+  std::atomic<bool> stopping = false, serving = false;
   std::mutex sessions_mutex;
   std::map<std::string, std::shared_ptr<WebSession>> sessions;
   std::set<std::string> expired;  // ids of sessions closed for being left idle
@@ -695,9 +697,19 @@ int Serveur::lier() {
   return impl_->port;
 }
 
-void Serveur::servir() { impl_->http.listen_after_bind(); }
+void Serveur::servir() {
+  impl_->serving = true;
+  if (!impl_->stopping) impl_->http.listen_after_bind();
+  impl_->serving = false;
+}
 
-void Serveur::arreter() { impl_->http.stop(); }
+void Serveur::arreter() {
+  impl_->stopping = true;
+  // The server only stops once it listens: one asked to stop as it starts would
+  // otherwise listen for ever.
+  while (impl_->serving && !impl_->http.is_running()) std::this_thread::sleep_for(std::chrono::milliseconds(1));
+  impl_->http.stop();
+}
 
 std::string Serveur::adresse() const {
   const std::string& host = impl_->options.host;

@@ -74,7 +74,7 @@ class Serveur {
 
   // Binds the port; returns the port bound. Throws HostError when it cannot.
   int lier();
-  // Serves until arreter(); lier() first.
+  // Serves until arreter() (returns at once when it was called before); lier() first.
   void servir();
   // Stops serving and closes every session. From any thread.
   void arreter();
