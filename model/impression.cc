@@ -1,9 +1,12 @@
 #include "model/impression.h"
 
-#include <atomic>
+#include <fcntl.h>
 #include <unistd.h>
 
+#include <atomic>
+#include <cerrno>
 #include <cstdio>
+#include <cstring>
 #include <filesystem>
 
 #include "host/currency.h"
@@ -41,13 +44,19 @@ int decimalsOf(const std::string& code) {
   return currencies.decimales(host::Devises::kReference);
 }
 
-// The first free "<name>-NNN.pdf" of the folder.
-std::string nextFile(const std::string& folder, const std::string& name) {
+// The first free "<name>-NNN.pdf" of the folder, taken (made empty) at once: two
+// sessions printing at the same moment, in one process or two, never get one name.
+std::string takeNextFile(const std::string& folder, const std::string& name) {
   for (int n = 1;; ++n) {
     char number[16];
     std::snprintf(number, sizeof number, "%03d", n);
-    std::filesystem::path path = std::filesystem::path(folder) / (name + "-" + number + ".pdf");
-    if (!std::filesystem::exists(path)) return path.string();
+    std::string path = (std::filesystem::path(folder) / (name + "-" + number + ".pdf")).string();
+    int fd = ::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0644);
+    if (fd >= 0) {
+      ::close(fd);
+      return path;
+    }
+    if (errno != EEXIST) throw host::HostError("impossible de créer « " + path + " » : " + std::strerror(errno));
   }
 }
 
@@ -109,7 +118,7 @@ void Imprimante::terminer() {
       std::filesystem::remove(scratch);
       return;
     }
-    std::string path = file ? *file : nextFile(*into, name);
+    std::string path = file ? *file : takeNextFile(*into, name);
     std::filesystem::rename(scratch, path);
     last_file_ = path;
     session.transcript().ajouter("impression", name + " : " + path);
