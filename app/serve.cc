@@ -2,10 +2,13 @@
 
 #include <httplib.h>
 
-#include <atomic>
+#include <chrono>
 #include <condition_variable>
 #include <deque>
+#include <filesystem>
+#include <fstream>
 #include <functional>
+#include <limits>
 #include <future>
 #include <map>
 #include <mutex>
@@ -13,6 +16,7 @@
 #include <optional>
 #include <random>
 #include <set>
+#include <stdexcept>
 #include <thread>
 
 #include "app/screen_layouts.h"
@@ -39,6 +43,9 @@ using nlohmann::json;
 
 constexpr std::size_t kMaxSessions = 64;
 constexpr std::size_t kMaxRequest = 64 * 1024;
+// A request nests no deeper than a gesture with its answers and a modal screen's
+// gestures; deeper is junk, refused before it costs anything.
+constexpr int kMaxDepth = 8;
 constexpr const char* kAnswerMissing = "réponse attendue : ";
 
 // A mistake of the page (a malformed request, an object the screen does not know):
@@ -47,51 +54,171 @@ struct BadRequest : host::HostError {
   using HostError::HostError;
 };
 
-// A question the page has not answered yet: thrown by the web user to stop the
-// action, which the session then undoes whole.
-struct AnswerMissing : host::HostError {
-  using HostError::HostError;
+// Stops the action for an answer the page has not given yet (a question, or the
+// gestures of a modal screen); the session then undoes the action whole. Not a
+// HostError: no branch of a screen may catch it and carry on.
+struct AnswerMissing : std::runtime_error {
+  using runtime_error::runtime_error;
 };
 
 bool isLoopback(const std::string& host) { return host == "127.0.0.1" || host == "::1" || host == "localhost"; }
 
-// The person at the page: answers the screens' questions from the answers the page
-// sent with the action, in order; the first question without one stops the action.
+std::string text(const json& request, const char* key) {
+  if (!request.contains(key) || !request[key].is_string())
+    throw BadRequest(std::string("« ") + key + " » manque ou n'est pas un texte");
+  return request[key].get<std::string>();
+}
+
+int number(const json& request, const char* key) {
+  const json* n = request.contains(key) ? &request[key] : nullptr;
+  bool fits = n && ((n->is_number_unsigned() && n->get<std::uint64_t>() <= std::numeric_limits<int>::max()) ||
+                    (n->is_number_integer() && !n->is_number_unsigned() &&
+                     n->get<std::int64_t>() >= std::numeric_limits<int>::min() &&
+                     n->get<std::int64_t>() <= std::numeric_limits<int>::max()));
+  if (!fits) throw BadRequest(std::string("« ") + key + " » manque ou n'est pas un entier");
+  return n->get<int>();
+}
+
+// One gesture of the page, read and checked before anything of it is played.
+struct Gesture {
+  std::string geste, objet, texte, module;
+  int ligne = 0;
+};
+
+Gesture gestureOf(const json& request) {
+  if (!request.is_object()) throw BadRequest("un geste est un objet JSON");
+  Gesture g;
+  g.geste = text(request, "geste");
+  static const std::set<std::string> kBare = {"fermer",          "nouvelle_ligne",  "valider_ligne",
+                                              "supprimer_ligne", "abandonner_ligne"};
+  if (g.geste == "ouvrir") {
+    g.module = text(request, "module");
+  } else if (g.geste == "saisir") {
+    g.objet = text(request, "objet");
+    g.texte = text(request, "texte");
+  } else if (g.geste == "appuyer" || g.geste == "choix") {
+    g.objet = text(request, "objet");
+  } else if (g.geste == "aller_ligne" || g.geste == "choisir_ligne" || g.geste == "lire_plus") {
+    g.ligne = number(request, "ligne");
+  } else if (!kBare.count(g.geste)) {
+    throw BadRequest("geste « " + g.geste + " » inconnu");
+  }
+  return g;
+}
+
+// An answer the page gives to what the action asks: a question's "oui"/"non", a
+// dialog's code, a choice window's key (null: cancelled), or the gestures made so
+// far on a modal screen.
+struct Answer {
+  std::string sorte;
+  std::optional<std::string> valeur;
+  std::vector<Gesture> gestes;
+};
+
+std::vector<Answer> answersOf(const json& request) {
+  std::vector<Answer> out;
+  if (!request.contains("reponses")) return out;
+  const json& given = request["reponses"];
+  if (!given.is_array()) throw BadRequest("« reponses » est une liste");
+  for (const json& a : given) {
+    if (!a.is_object()) throw BadRequest("une réponse est un objet JSON");
+    Answer answer;
+    answer.sorte = text(a, "sorte");
+    if (answer.sorte == "ecran") {
+      if (!a.contains("gestes") || !a["gestes"].is_array())
+        throw BadRequest("les gestes d'un écran sont une liste");
+      for (const json& g : a["gestes"]) {
+        if (g.is_object() && g.contains("reponses"))
+          throw BadRequest("les réponses d'un geste d'écran suivent son entrée dans « reponses »");
+        answer.gestes.push_back(gestureOf(g));
+        if (answer.gestes.back().geste == "ouvrir") throw BadRequest("un écran modal n'ouvre pas de module");
+      }
+    } else if (answer.sorte == "question" || answer.sorte == "dialogue") {
+      answer.valeur = text(a, "valeur");
+    } else if (answer.sorte == "choix") {
+      if (!a.contains("valeur") || !(a["valeur"].is_null() || a["valeur"].is_string()))
+        throw BadRequest("la réponse à une fenêtre de choix est une clé ou null");
+      if (a["valeur"].is_string()) answer.valeur = a["valeur"].get<std::string>();
+    } else {
+      throw BadRequest("sorte de réponse « " + answer.sorte + " » inconnue");
+    }
+    out.push_back(std::move(answer));
+  }
+  return out;
+}
+
+json screensState(host::Session& session);
+bool play(host::Session& s, const Gesture& g);
+
+// The person at the page: answers what the action asks from the answers the page
+// sent with it, in order; the first thing asked without an answer stops the action,
+// and the reply names it ("attente", with its place "rang" among the answers).
 class WebUser : public host::UserAgent {
  public:
-  void begin(const json& answers) {
-    answers_.clear();
-    for (const json& a : answers) {
-      if (!a.is_object() || !a.contains("sorte") || !a["sorte"].is_string())
-        throw BadRequest("réponse mal formée : " + a.dump());
-      answers_.push_back(a);
-    }
+  void begin(std::vector<Answer> answers) {
+    answers_ = std::move(answers);
     used_ = 0;
+    played_.clear();
+    replayed_ = 0;
     waiting_.reset();
+    mistake_.reset();
     drawings_ = json::array();
   }
 
   bool oui(const std::string& question) override {
-    const json* a = next("question", {{"sorte", "question"}, {"texte", question}});
-    return a->is_string() && *a == "oui";
+    return next("question", {{"sorte", "question"}, {"texte", question}}) == "oui";
   }
   std::string dialogue(const std::string& title, const std::string& text,
                        const std::vector<std::string>& choices) override {
-    const json* a = next("dialogue", {{"sorte", "dialogue"}, {"titre", title}, {"texte", text}, {"choix", choices}});
-    if (!a->is_string()) throw BadRequest("la réponse à un dialogue est le code d'un choix");
-    return a->get<std::string>();
+    return next("dialogue", {{"sorte", "dialogue"}, {"titre", title}, {"texte", text}, {"choix", choices}}).value();
   }
   std::optional<std::string> choisir(const std::string& window, const std::vector<std::string>& rows) override {
-    const json* a = next("choix", {{"sorte", "choix"}, {"texte", window}, {"choix", rows}});
-    if (a->is_null()) return std::nullopt;
-    if (!a->is_string()) throw BadRequest("la réponse à une fenêtre de choix est une clé ou null");
-    return a->get<std::string>();
+    return next("choix", {{"sorte", "choix"}, {"texte", window}, {"choix", rows}});
   }
-  // A modal screen is not worked from the page yet: it closes as it opened.
-  void piloter(host::Session&, host::Automate&) override {}
-  // Questions answered before the action was played again are in the session's
-  // journal: it asks again only from the first one not answered.
-  void actionRecommencee() override {}
+
+  // Plays on the modal screen the gestures of the entry the page gave for it. When
+  // the screen is still open after them, or a gesture was refused, or no entry was
+  // given, the action stops: the reply shows the screens as the modal screen left
+  // them, for the person to go on from there.
+  void piloter(host::Session& session, host::Automate& screen) override {
+    if (waiting_) throw AnswerMissing(kAnswerMissing + screen.code());
+    std::size_t at = used_;
+    if (replayed_ < played_.size()) {
+      at = played_[replayed_++];
+    } else if (used_ < answers_.size() && answers_[used_].sorte == "ecran") {
+      played_.push_back(used_++);
+      replayed_ = played_.size();
+    } else {
+      stopOnScreen(session, screen, at, std::nullopt);
+    }
+    auto open = [&] {
+      auto screens = session.ecrans();
+      return std::find(screens.begin(), screens.end(), &screen) != screens.end() && !screen.estTermine();
+    };
+    const std::vector<Gesture>& gestures = answers_[at].gestes;
+    for (std::size_t i = 0; i < gestures.size(); ++i) {
+      bool accepted = false;
+      try {
+        if (!open()) throw BadRequest("geste après la fermeture de l'écran « " + screen.code() + " »");
+        accepted = play(session, gestures[i]);
+      } catch (const host::HostError& e) {
+        // A gesture the screen cannot take (an object it does not know) is the
+        // page's mistake, as at the top.
+        mistake_ = e.what();
+        throw AnswerMissing(kAnswerMissing + screen.code());
+      }
+      if (!accepted) stopOnScreen(session, screen, at, i);
+    }
+    if (open()) stopOnScreen(session, screen, at, std::nullopt);
+  }
+  // The host plays the action again itself (another process wrote): the modal
+  // screens get the same entries again, in order; the questions answered are in the
+  // session's journal.
+  void actionCommencee() override {
+    played_.clear();
+    replayed_ = 0;
+  }
+  void actionRecommencee() override { replayed_ = 0; }
   void dessiner(host::Automate& screen, host::Ecran::Dessin dessin) override {
     if (dessin.affichages.empty() && dessin.fonctions.empty()) return;
     json functions = json::array();
@@ -100,19 +227,39 @@ class WebUser : public host::UserAgent {
   }
 
   const std::optional<json>& waiting() const { return waiting_; }
+  // A gesture of a modal screen's entry that could not be played: the request
+  // was malformed.
+  const std::optional<std::string>& mistake() const { return mistake_; }
   const json& drawings() const { return drawings_; }
+  // The prints this session made, by file name: the only files it serves.
+  std::map<std::string, std::string> prints;
 
  private:
-  const json* next(const std::string& kind, json asked) {
-    if (used_ < answers_.size() && answers_[used_]["sorte"] == kind && answers_[used_].contains("valeur"))
-      return &answers_[used_++]["valeur"];
-    waiting_ = std::move(asked);
-    throw AnswerMissing(kAnswerMissing + (*waiting_)["texte"].get<std::string>());
+  std::optional<std::string> next(const std::string& kind, json asked) {
+    if (!waiting_ && used_ < answers_.size() && answers_[used_].sorte == kind) return answers_[used_++].valeur;
+    if (!waiting_) {
+      asked["rang"] = used_;
+      waiting_ = std::move(asked);
+    }
+    throw AnswerMissing(kAnswerMissing + (*waiting_)["sorte"].get<std::string>());
   }
 
-  std::vector<json> answers_;
+  // The state is taken now, before the action is undone.
+  [[noreturn]] void stopOnScreen(host::Session& session, host::Automate& screen, std::size_t rank,
+                                 std::optional<std::size_t> refused) {
+    waiting_ = json{{"sorte", "ecran"},
+                    {"rang", rank},
+                    {"etat", screensState(session)},
+                    {"refus", refused ? json(*refused) : json(nullptr)}};
+    throw AnswerMissing(kAnswerMissing + screen.code());
+  }
+
+  std::vector<Answer> answers_;
   std::size_t used_ = 0;
+  std::vector<std::size_t> played_;  // the modal entries played since the action began
+  std::size_t replayed_ = 0;         // how many of them the action played again
   std::optional<json> waiting_;
+  std::optional<std::string> mistake_;
   json drawings_ = json::array();
 };
 
@@ -125,16 +272,19 @@ std::vector<std::string> fieldsOf(host::Automate& screen) {
   return names;
 }
 
-// The buttons of the screens: the commands of the access lists and the branches the
-// screens name as buttons ("B_VALID_DOC", "BT_ANALYTIQUE"). The other branches are
-// the events of the screens' cycles and the branches of their objects, run by the
-// hands at their moment, never pressed.
+// The buttons of the screens: the commands of the access lists and of the modal
+// screens, and the branches the screens name as buttons ("B_VALID_DOC",
+// "BT_ANALYTIQUE"). A document's own validation ("VALID_DOC") is a button where the
+// screen names none of its own. The other branches are the events of the screens'
+// cycles and the branches of their objects, run by the hands at their moment, never
+// pressed.
 std::vector<std::string> actionsOf(host::Automate& screen) {
-  static const std::set<std::string> kCommands = {"CREER",      "MODIFIER",   "GERER",      "SUPPRESSION",
-                                                  "VISU_PIECE", "IMPR_FICHE", "IMPR_LISTE", "VALID"};
+  static const std::set<std::string> kCommands = {"CREER",      "MODIFIER",   "GERER", "SUPPRESSION", "VISU_PIECE",
+                                                  "IMPR_FICHE", "IMPR_LISTE", "VALID", "ABAND"};
   std::vector<std::string> out;
   for (const std::string& b : screen.branches())
     if (kCommands.count(b) || b.rfind("B_", 0) == 0 || b.rfind("BT_", 0) == 0) out.push_back(b);
+  if (screen.aBranche("VALID_DOC") && !screen.aBranche("B_VALID_DOC")) out.push_back("VALID_DOC");
   return out;
 }
 
@@ -190,42 +340,27 @@ json screensState(host::Session& session) {
   return state;
 }
 
-std::string text(const json& request, const char* key) {
-  if (!request.contains(key) || !request[key].is_string())
-    throw BadRequest(std::string("« ") + key + " » manque ou n'est pas un texte");
-  return request[key].get<std::string>();
-}
-
-int number(const json& request, const char* key) {
-  if (!request.contains(key) || !request[key].is_number_integer())
-    throw BadRequest(std::string("« ") + key + " » manque ou n'est pas un entier");
-  return request[key].get<int>();
-}
-
 // Plays one gesture through the user's hands; true when the action was accepted.
-bool play(host::Session& s, const json& request) {
-  const std::string gesture = text(request, "geste");
-  if (gesture == "ouvrir") return model::ouvrir(s, text(request, "module"));
-  if (gesture == "fermer") {
+bool play(host::Session& s, const Gesture& g) {
+  if (g.geste == "ouvrir") return model::ouvrir(s, g.module);
+  if (g.geste == "fermer") {
     model::fermer(s);
     return true;
   }
-  if (gesture == "saisir") return model::saisir(s, text(request, "objet"), text(request, "texte"));
-  if (gesture == "appuyer") return model::appuyer(s, text(request, "objet"));
-  if (gesture == "choix") return model::ouvrirChoix(s, text(request, "objet"));
-  if (gesture == "nouvelle_ligne") return model::nouvelleLigne(s);
-  if (gesture == "aller_ligne") return model::allerLigne(s, number(request, "ligne"));
-  if (gesture == "valider_ligne") return model::validerLigne(s);
-  if (gesture == "supprimer_ligne") return model::supprimerLigne(s);
-  if (gesture == "abandonner_ligne") return model::abandonnerLigne(s);
-  if (gesture == "choisir_ligne") return model::choisirLigne(s, number(request, "ligne"));
-  if (gesture == "lire_plus") {
-    auto* list = dynamic_cast<model::Scritere*>(&model::ecranDevant(s));
-    if (!list) throw BadRequest("l'écran n'a pas de liste d'accès");
-    std::size_t upTo = static_cast<std::size_t>(std::max(1, number(request, "ligne")));
-    return s.action([&] { list->readUntil(upTo); });
-  }
-  throw BadRequest("geste « " + gesture + " » inconnu");
+  if (g.geste == "saisir") return model::saisir(s, g.objet, g.texte);
+  if (g.geste == "appuyer") return model::appuyer(s, g.objet);
+  if (g.geste == "choix") return model::ouvrirChoix(s, g.objet);
+  if (g.geste == "nouvelle_ligne") return model::nouvelleLigne(s);
+  if (g.geste == "aller_ligne") return model::allerLigne(s, g.ligne);
+  if (g.geste == "valider_ligne") return model::validerLigne(s);
+  if (g.geste == "supprimer_ligne") return model::supprimerLigne(s);
+  if (g.geste == "abandonner_ligne") return model::abandonnerLigne(s);
+  if (g.geste == "choisir_ligne") return model::choisirLigne(s, g.ligne);
+  // lire_plus: reads an access list on to that row
+  auto* list = dynamic_cast<model::Scritere*>(&model::ecranDevant(s));
+  if (!list) throw BadRequest("l'écran n'a pas de liste d'accès");
+  std::size_t upTo = static_cast<std::size_t>(std::max(1, g.ligne));
+  return s.action([&] { list->readUntil(upTo); });
 }
 
 // One tab's session, on a thread of its own: the session and the printer belong
@@ -261,9 +396,25 @@ class WebSession {
       std::lock_guard lock(mutex_);
       if (stopping_) throw host::HostError("session fermée");
       tasks_.push_back(std::move(job));
+      ++busy_;
     }
     wake_.notify_one();
+    struct Done {
+      WebSession& s;
+      ~Done() {
+        std::lock_guard lock(s.mutex_);
+        --s.busy_;
+        s.last_use_ = std::chrono::steady_clock::now();
+      }
+    } done{*this};
     return result.get();
+  }
+
+  // Whether nobody used the session for longer than `limit` (a request under way
+  // uses it).
+  bool idle(std::chrono::steady_clock::time_point now, std::chrono::milliseconds limit) {
+    std::lock_guard lock(mutex_);
+    return busy_ == 0 && now - last_use_ > limit;
   }
 
  private:
@@ -299,6 +450,8 @@ class WebSession {
   std::condition_variable wake_;
   std::deque<std::packaged_task<json()>> tasks_;
   bool stopping_ = false;
+  int busy_ = 0;  // requests queued or under way
+  std::chrono::steady_clock::time_point last_use_ = std::chrono::steady_clock::now();
   std::thread worker_;
 };
 
@@ -316,6 +469,17 @@ json reply(host::Session& session, WebUser& user, std::size_t from, std::optiona
   }
   out["journal"] = std::move(entries);
   out["dessins"] = user.drawings();
+  // The prints the action wrote, landed with it: "fiche1 : FOLDER/fiche1-002.pdf".
+  json prints = json::array();
+  for (const host::Entree& e : session.transcript().depuis(from)) {
+    std::size_t at = e.texte.find(" : ");
+    if (e.sorte != "impression" || at == std::string::npos) continue;
+    std::string path = e.texte.substr(at + 3);
+    std::string name = std::filesystem::path(path).filename().string();
+    user.prints[name] = path;
+    prints.push_back(name);
+  }
+  out["impressions"] = std::move(prints);
   return out;
 }
 
@@ -333,12 +497,38 @@ struct Serveur::Impl {
   int port = 0;
   std::mutex sessions_mutex;
   std::map<std::string, std::shared_ptr<WebSession>> sessions;
+  std::set<std::string> expired;  // ids of sessions closed for being left idle
   std::mt19937_64 ids{std::random_device{}()};
 
-  std::shared_ptr<WebSession> find(const std::string& id) {
+  // Closes the sessions left idle too long. Their ids are remembered (a few
+  // thousand at most) so that their tabs are told why.
+  void expire() {
+    std::vector<std::shared_ptr<WebSession>> gone;
+    {
+      std::lock_guard lock(sessions_mutex);
+      auto now = std::chrono::steady_clock::now();
+      for (auto it = sessions.begin(); it != sessions.end();) {
+        if (!it->second->idle(now, options.idleLimit)) {
+          ++it;
+          continue;
+        }
+        if (expired.size() >= 4096) expired.clear();
+        expired.insert(it->first);
+        gone.push_back(std::move(it->second));
+        it = sessions.erase(it);
+      }
+    }
+    // Closed here, out of the lock: a session's thread ends its work first.
+  }
+
+  // The session `id`, or nothing when the reply, a 404, is sent.
+  std::shared_ptr<WebSession> find(const std::string& id, httplib::Response& res) {
+    expire();
     std::lock_guard lock(sessions_mutex);
     auto it = sessions.find(id);
-    return it == sessions.end() ? nullptr : it->second;
+    if (it != sessions.end()) return it->second;
+    sendJson(res, 404, {{"erreur", expired.count(id) ? "session expirée" : "session inconnue"}});
+    return nullptr;
   }
 
   std::string newId() {
@@ -358,6 +548,11 @@ struct Serveur::Impl {
     return origin != local && origin != named;
   }
 
+  static json state(host::Session& s, WebUser& user) {
+    user.begin({});
+    return reply(s, user, s.transcript().oubliees() + s.transcript().entrees().size(), std::nullopt);
+  }
+
   void routes() {
     http.set_payload_max_length(kMaxRequest);
     http.set_pre_routing_handler([this](const httplib::Request& req, httplib::Response& res) {
@@ -365,6 +560,17 @@ struct Serveur::Impl {
       sendJson(res, 403, {{"erreur", "requête d'une autre origine refusée"}});
       return httplib::Server::HandlerResponse::Handled;
     });
+    // What the library answers by itself (a body too large, a path no route takes)
+    // gets its reason in JSON too.
+    http.set_error_handler(
+        httplib::Server::HandlerWithResponse([](const httplib::Request&, httplib::Response& res) {
+          if (!res.body.empty()) return httplib::Server::HandlerResponse::Unhandled;
+          const char* why = res.status == 413   ? "requête trop grosse (64 Kio au plus)"
+                            : res.status == 404 ? "adresse inconnue"
+                                                : "requête refusée";
+          sendJson(res, res.status, {{"erreur", why}});
+          return httplib::Server::HandlerResponse::Handled;
+        }));
     http.set_exception_handler([](const httplib::Request&, httplib::Response& res, std::exception_ptr ep) {
       std::string why = "erreur inconnue";
       int status = 500;
@@ -390,6 +596,7 @@ struct Serveur::Impl {
       sendJson(res, 404, {{"erreur", "aucune disposition pour « " + std::string(req.matches[1]) + " »"}});
     });
     http.Post("/api/sessions", [this](const httplib::Request&, httplib::Response& res) {
+      expire();
       {
         std::lock_guard lock(sessions_mutex);
         if (sessions.size() >= kMaxSessions) {
@@ -404,46 +611,54 @@ struct Serveur::Impl {
         id = newId();
         sessions[id] = session;
       }
-      json state = session->run([](host::Session& s, WebUser& user) {
-        user.begin(json::array());
-        return reply(s, user, s.transcript().oubliees() + s.transcript().entrees().size(), std::nullopt);
-      });
-      state["session"] = id;
-      sendJson(res, 201, state);
+      json opened = session->run(state);
+      opened["session"] = id;
+      sendJson(res, 201, opened);
     });
     http.Get(R"(/api/sessions/([0-9a-f]+))", [this](const httplib::Request& req, httplib::Response& res) {
-      auto session = find(req.matches[1]);
-      if (!session) return sendJson(res, 404, {{"erreur", "session inconnue"}});
-      sendJson(res, 200, session->run([](host::Session& s, WebUser& user) {
-        user.begin(json::array());
-        return reply(s, user, s.transcript().oubliees() + s.transcript().entrees().size(), std::nullopt);
-      }));
+      if (auto session = find(req.matches[1], res)) sendJson(res, 200, session->run(state));
     });
     http.Delete(R"(/api/sessions/([0-9a-f]+))", [this](const httplib::Request& req, httplib::Response& res) {
-      std::shared_ptr<WebSession> gone;
+      auto gone = find(req.matches[1], res);
+      if (!gone) return;
       {
         std::lock_guard lock(sessions_mutex);
-        auto it = sessions.find(req.matches[1]);
-        if (it == sessions.end()) return sendJson(res, 404, {{"erreur", "session inconnue"}});
-        gone = std::move(it->second);
-        sessions.erase(it);
+        sessions.erase(req.matches[1]);
       }
       gone.reset();
       sendJson(res, 200, {{"fermee", true}});
     });
     http.Post(R"(/api/sessions/([0-9a-f]+)/gestes)", [this](const httplib::Request& req, httplib::Response& res) {
-      auto session = find(req.matches[1]);
-      if (!session) return sendJson(res, 404, {{"erreur", "session inconnue"}});
-      json request = json::parse(req.body);
-      if (!request.is_object()) throw BadRequest("un geste est un objet JSON");
-      json answers = request.contains("reponses") ? request["reponses"] : json::array();
-      if (!answers.is_array()) throw BadRequest("« reponses » est une liste");
+      auto session = find(req.matches[1], res);
+      if (!session) return;
+      json request = json::parse(req.body, [](int depth, json::parse_event_t, json&) {
+        if (depth > kMaxDepth) throw BadRequest("requête trop imbriquée");
+        return true;
+      });
+      Gesture gesture = gestureOf(request);
+      std::vector<Answer> answers = answersOf(request);
       sendJson(res, 200, session->run([&](host::Session& s, WebUser& user) {
-        user.begin(answers);
+        user.begin(std::move(answers));
         std::size_t from = s.transcript().oubliees() + s.transcript().entrees().size();
-        bool accepted = play(s, request);
+        bool accepted = play(s, gesture);
+        if (user.mistake()) throw BadRequest(*user.mistake());
         return reply(s, user, from, accepted);
       }));
+    });
+    // A print of the session, by the plain name a reply gave it; nothing else.
+    http.Get(R"(/api/sessions/([0-9a-f]+)/impressions/(.*))", [this](const httplib::Request& req,
+                                                                     httplib::Response& res) {
+      auto session = find(req.matches[1], res);
+      if (!session) return;
+      std::string name = req.matches[2];
+      json found = session->run([&](host::Session&, WebUser& user) {
+        auto it = user.prints.find(name);
+        return it == user.prints.end() ? json(nullptr) : json(it->second);
+      });
+      std::ifstream file(found.is_string() ? found.get<std::string>() : std::string(), std::ios::binary);
+      if (!found.is_string() || !file) return sendJson(res, 404, {{"erreur", "impression inconnue : " + name}});
+      std::string content((std::istreambuf_iterator<char>(file)), std::istreambuf_iterator<char>());
+      res.set_content(std::move(content), "application/pdf");
     });
   }
 };

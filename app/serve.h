@@ -8,21 +8,43 @@
 // played there one after the other; sessions run side by side.
 //
 // The API (JSON):
-//   POST   /api/sessions              opens a session; answers its id and state
-//   GET    /api/sessions/ID           the state of the screens
-//   POST   /api/sessions/ID/gestes    one user action: {"geste": ..., ...}
-//   DELETE /api/sessions/ID           closes the session
+//   POST   /api/sessions                      opens a session; answers its id and state
+//   GET    /api/sessions/ID                   the state of the screens
+//   POST   /api/sessions/ID/gestes            one user action: {"geste": ..., ...}
+//   DELETE /api/sessions/ID                   closes the session
+//   GET    /api/sessions/ID/impressions/FILE  a print of the session (application/pdf)
 // A gesture is "ouvrir" (module), "fermer", "saisir" (objet, texte), "appuyer"
 // (objet), "choix" (objet), "nouvelle_ligne", "aller_ligne" (ligne),
 // "valider_ligne", "supprimer_ligne", "abandonner_ligne", "choisir_ligne" (ligne),
-// "lire_plus" (ligne: reads an access list on to that row). It may carry
-// "reponses": the answers to the questions the action asks, in order, each
-// {"sorte": "question"|"dialogue"|"choix", "valeur": "oui"|"non"|code|key|null}.
-// The screens ask synchronously: a question with no answer given stops the action,
-// which is undone whole, and the reply names the question ("attente"); the page
-// asks the person and plays the action again with the answer.
+// "lire_plus" (ligne: reads an access list on to that row).
+//
+// The screens ask synchronously, and nobody waits for a person inside an action:
+// the gesture carries "reponses", the answers to what the action asks, in the order
+// it asks. Each is {"sorte": "question"|"dialogue"|"choix", "valeur": "oui"|"non"|
+// code|key|null}, or, for a modal screen the action opens (the analytic breakdown,
+// the justification of a bank line), {"sorte": "ecran", "gestes": [...]}: the
+// gestures the person made on it so far, shaped as top-level ones without their own
+// answers; the questions those gestures ask are answered by the entries after it.
+// The first thing asked without an answer stops the action, which is undone whole,
+// and the reply's "attente" names it with "rang", the place in "reponses" where
+// its answer goes. For a modal screen still open after its gestures (or given none),
+// "attente" is {"sorte": "ecran", "rang": R, "etat": S, "refus": null|i}: S the
+// screens as the modal screen left them, shaped as a reply's state, and i the
+// gesture it refused (the page drops it and those after it). The page asks the
+// person and plays the action again with the answer; the action commits once,
+// when it runs to its end with every answer given.
+//
+// A reply: the state ("pile", the open screens; "ecran", the one in front with its
+// "code", "focus", "objets", "actions" and "liste"), "accepte", "attente",
+// "journal" (what the transcript took), "dessins", and "impressions": the files
+// the action printed, landed with it, served by the route above to this session
+// only. Errors answer {"erreur": ...}: 400 a malformed request, 403 a request from
+// another origin, 404 an unknown session or file, or "session expirée" for a
+// session left unused longer than ServeOptions::idleLimit (8 hours by default),
+// 413 a body over 64 KiB.
 #pragma once
 
+#include <chrono>
 #include <memory>
 #include <ostream>
 #include <string>
@@ -36,6 +58,9 @@ struct ServeOptions {
   // Only a loopback address is bound unless this is set: the screens give whoever
   // reaches the port the dossier's books.
   bool allowRemote = false;
+  // A session nobody used for this long is closed: its tab is told "session
+  // expirée" and starts again.
+  std::chrono::milliseconds idleLimit = std::chrono::hours(8);
 };
 
 class Serveur {

@@ -6,9 +6,12 @@
 #include <httplib.h>
 
 #include <algorithm>
+#include <chrono>
+#include <filesystem>
 #include <nlohmann/json.hpp>
 #include <thread>
 
+#include "app/script.h"
 #include "host/error.h"
 #include "tests/support/fixture.h"
 
@@ -20,15 +23,23 @@ class ServeTest : public testing_support::DossierTest {
  protected:
   void SetUp() override {
     DossierTest::SetUp();
-    server_ = std::make_unique<app::Serveur>(app::ServeOptions{.dossier = path_, .port = 0});
+    demarrer({.dossier = path_, .port = 0});
+  }
+  void TearDown() override {
+    arreterServeur();
+    std::filesystem::remove_all(app::dossierImpressions(path_));
+    DossierTest::TearDown();
+  }
+
+  void demarrer(app::ServeOptions options) {
+    server_ = std::make_unique<app::Serveur>(std::move(options));
     port_ = server_->lier();
     serving_ = std::thread([this] { server_->servir(); });
   }
-  void TearDown() override {
+  void arreterServeur() {
     server_->arreter();
     serving_.join();
     server_.reset();
-    DossierTest::TearDown();
   }
 
   httplib::Client client() { return httplib::Client("127.0.0.1", port_); }
@@ -55,27 +66,46 @@ class ServeTest : public testing_support::DossierTest {
     return "";
   }
 
-  // Enters a two-line client invoice up to its save, and returns the last reply.
-  json saisirFacture(const std::string& id, const std::string& client) {
-    const json steps[] = {
-        {{"geste", "ouvrir"}, {"module", "MIRVAE-ACCES1"}},
-        {{"geste", "appuyer"}, {"objet", "CREER"}},
-        {{"geste", "saisir"}, {"objet", "VLIBCP1"}, {"texte", client}},
-        {{"geste", "nouvelle_ligne"}},
-        {{"geste", "saisir"}, {"objet", "LST_MIRVAL.NUMCP"}, {"texte", "706300"}},
-        {{"geste", "saisir"}, {"objet", "LST_V_HT"}, {"texte", "1500"}},
-        {{"geste", "valider_ligne"}},
-        {{"geste", "nouvelle_ligne"}},
-        {{"geste", "saisir"}, {"objet", "LST_MIRVAL.NUMCP"}, {"texte", "708500"}},
-        {{"geste", "saisir"}, {"objet", "LST_V_HT"}, {"texte", "80,00"}},
-        {{"geste", "valider_ligne"}},
-    };
+  // Plays gestures that the screens all accept; returns the last reply.
+  json jouer(const std::string& id, const std::vector<json>& steps) {
     json state;
     for (const json& step : steps) {
       state = geste(id, step);
       EXPECT_TRUE(state["accepte"]) << step.dump() << " : " << state["journal"].dump();
     }
     return state;
+  }
+
+  // Enters a two-line client invoice up to its save, and returns the last reply.
+  json saisirFacture(const std::string& id, const std::string& client) {
+    return jouer(id, {
+                         {{"geste", "ouvrir"}, {"module", "MIRVAE-ACCES1"}},
+                         {{"geste", "appuyer"}, {"objet", "CREER"}},
+                         {{"geste", "saisir"}, {"objet", "VLIBCP1"}, {"texte", client}},
+                         {{"geste", "nouvelle_ligne"}},
+                         {{"geste", "saisir"}, {"objet", "LST_MIRVAL.NUMCP"}, {"texte", "706300"}},
+                         {{"geste", "saisir"}, {"objet", "LST_V_HT"}, {"texte", "1500"}},
+                         {{"geste", "valider_ligne"}},
+                         {{"geste", "nouvelle_ligne"}},
+                         {{"geste", "saisir"}, {"objet", "LST_MIRVAL.NUMCP"}, {"texte", "708500"}},
+                         {{"geste", "saisir"}, {"objet", "LST_V_HT"}, {"texte", "80,00"}},
+                         {{"geste", "valider_ligne"}},
+                     });
+  }
+
+  // A supplier invoice's line of wood, 2400 HT, its account spread by the key ATEL,
+  // the line chosen for its analytic breakdown.
+  void saisirBois(const std::string& id) {
+    jouer(id, {
+                  {{"geste", "ouvrir"}, {"module", "MIRVAE-ACCES2"}},
+                  {{"geste", "appuyer"}, {"objet", "CREER"}},
+                  {{"geste", "saisir"}, {"objet", "VLIBCP1"}, {"texte", "Scierie Maurel Frères"}},
+                  {{"geste", "nouvelle_ligne"}},
+                  {{"geste", "saisir"}, {"objet", "LST_MIRVAL.NUMCP"}, {"texte", "601000"}},
+                  {{"geste", "saisir"}, {"objet", "LST_V_HT"}, {"texte", "2400"}},
+                  {{"geste", "valider_ligne"}},
+                  {{"geste", "aller_ligne"}, {"ligne", 1}},
+              });
   }
 
   std::unique_ptr<app::Serveur> server_;
@@ -147,6 +177,142 @@ TEST_F(ServeTest, TwoTabsEnterInvoicesAtOnceEachInItsOwnSession) {
   EXPECT_EQ(json::parse(still->body)["ecran"]["code"], "MIRVAE-GESTION1");
 }
 
+TEST_F(ServeTest, TheAnalyticBreakdownIsWorkedOnItsModalScreenAndLandsOnlyWithTheSavedInvoice) {
+  const json press = {{"geste", "appuyer"}, {"objet", "BT_ANALYTIQUE"}};
+  auto nothingInTheDossier = [&] {
+    for (const char* table : {"MIRVAE", "MIRVAL", "MIRVAANA", "PIECE", "VTSEC"})
+      EXPECT_EQ(sql(std::string("SELECT count(*) FROM ") + table), "0") << table;
+  };
+
+  // A tab closed while the breakdown screen waits for the person leaves nothing.
+  std::string closed = ouvrirSession();
+  saisirBois(closed);
+  json partial = press;
+  partial["reponses"] = {{{"sorte", "ecran"}, {"gestes", {{{"geste", "aller_ligne"}, {"ligne", 1}}}}}};
+  EXPECT_EQ(geste(closed, partial)["attente"]["sorte"], "ecran");
+  auto deleted = client().Delete("/api/sessions/" + closed);
+  ASSERT_TRUE(deleted);
+  EXPECT_EQ(deleted->status, 200);
+  nothingInTheDossier();
+
+  // Pressed, the button opens the breakdown spread by the account's key, and the
+  // action waits for the gestures made on it; the screen behind is as it was.
+  std::string id = ouvrirSession();
+  saisirBois(id);
+  json waiting = geste(id, press);
+  EXPECT_FALSE(waiting["accepte"]);
+  EXPECT_EQ(waiting["ecran"]["code"], "MIRVAE-GESTION2");
+  EXPECT_EQ(waiting["attente"]["sorte"], "ecran");
+  EXPECT_EQ(waiting["attente"]["rang"], 0);
+  EXPECT_TRUE(waiting["attente"]["refus"].is_null());
+  const json& modal = waiting["attente"]["etat"];
+  EXPECT_EQ(modal["pile"].back(), "MIRVAE-GEST_ANA");
+  EXPECT_EQ(modal["ecran"]["code"], "MIRVAE-GEST_ANA");
+  EXPECT_EQ(modal["ecran"]["liste"]["lignes"].size(), 2u);
+  EXPECT_TRUE(std::any_of(modal["ecran"]["actions"].begin(), modal["ecran"]["actions"].end(),
+                          [](const json& a) { return a["nom"] == "VALID_DOC"; }));
+
+  // The person shares the wood evenly, one gesture after the other; the page sends
+  // what was done on the screen so far, and drops a refused gesture.
+  const json typed = {{{"geste", "aller_ligne"}, {"ligne", 1}},
+                      {{"geste", "saisir"}, {"objet", "LST_V_MTANA"}, {"texte", "1200"}},
+                      {{"geste", "valider_ligne"}},
+                      {{"geste", "aller_ligne"}, {"ligne", 2}},
+                      {{"geste", "saisir"}, {"objet", "LST_V_MTANA"}, {"texte", "1200"}},
+                      {{"geste", "valider_ligne"}}};
+  const json validate = {{"geste", "appuyer"}, {"objet", "VALID_DOC"}}, close = {{"geste", "fermer"}};
+  const struct {
+    std::vector<json> gestes;
+    json refus;            // the gesture refused, null when none
+    std::string reste;     // what remains to spread, as the modal screen shows it; "" when it closed
+    std::string message;   // in the journal
+  } steps[] = {
+      {{typed[0], typed[1], typed[2], validate}, 3, "240.00", "Le total ventilé est différent du montant du mouvement"},
+      {{typed[0], typed[1], typed[2], typed[3], typed[4], typed[5]}, nullptr, "0.00", ""},
+      {{typed[0], typed[1], typed[2], typed[3], typed[4], typed[5], validate, close}, nullptr, "", ""},
+  };
+  for (const auto& step : steps) {
+    json request = press;
+    request["reponses"] = {{{"sorte", "ecran"}, {"gestes", step.gestes}}};
+    json r = geste(id, request);
+    SCOPED_TRACE(r.dump());
+    EXPECT_NE(r["journal"].dump().find(step.message), std::string::npos);
+    if (step.reste.empty()) {
+      EXPECT_TRUE(r["accepte"]);
+      EXPECT_TRUE(r["attente"].is_null());
+      EXPECT_EQ(r["ecran"]["code"], "MIRVAE-GESTION2");
+      continue;
+    }
+    EXPECT_EQ(r["attente"]["refus"], step.refus);
+    EXPECT_EQ(valeur(r["attente"]["etat"], "V_RESTE_ANA"), step.reste);
+    nothingInTheDossier();
+  }
+  // A modal gesture the screen does not know is the page's mistake.
+  json wrong = press;
+  wrong["reponses"] = {{{"sorte", "ecran"}, {"gestes", {{{"geste", "saisir"}, {"objet", "NULLE_PART"}, {"texte", "1"}}}}}};
+  auto refused = client().Post("/api/sessions/" + id + "/gestes", wrong.dump(), "application/json");
+  ASSERT_TRUE(refused);
+  EXPECT_EQ(refused->status, 400) << refused->body;
+
+  // Saved, the invoice posts the line's breakdown as the person typed it.
+  jouer(id, {{{"geste", "nouvelle_ligne"}},
+             {{"geste", "saisir"}, {"objet", "LST_MIRVAL.NUMCP"}, {"texte", "624100"}},
+             {{"geste", "saisir"}, {"objet", "LST_V_HT"}, {"texte", "150"}},
+             {{"geste", "valider_ligne"}},
+             {{"geste", "appuyer"}, {"objet", "B_VALID_DOC"}, {"reponses", {{{"sorte", "dialogue"}, {"valeur", "1"}}}}}});
+  EXPECT_EQ(sql("SELECT group_concat(s, ', ') FROM (SELECT CSECT || ' ' || MTADE AS s FROM VTSEC JOIN MOUVE ON "
+                "MOUVE.UNIQ = VTSEC.MOUVE_UNIQ WHERE NUMCP = '601000' ORDER BY CSECT)"),
+            "ATELIER 1200, CHANTIER 1200");
+  EXPECT_EQ(sql("SELECT count(*) FROM PIECE"), "1");
+  EXPECT_EQ(testing_support::incoherences(base()), std::vector<std::string>{});
+}
+
+TEST_F(ServeTest, APrintOfTheListIsServedAsAPdfToItsOwnSessionOnly) {
+  std::string id = ouvrirSession(), other = ouvrirSession();
+  geste(id, {{"geste", "ouvrir"}, {"module", "MIRVAE-ACCES1"}});
+  json printed = geste(id, {{"geste", "appuyer"}, {"objet", "IMPR_LISTE"}});
+  ASSERT_EQ(printed["impressions"].size(), 1u) << printed.dump();
+  std::string name = printed["impressions"][0];
+  auto pdf = client().Get("/api/sessions/" + id + "/impressions/" + name);
+  ASSERT_TRUE(pdf);
+  EXPECT_EQ(pdf->status, 200);
+  EXPECT_EQ(pdf->get_header_value("Content-Type"), "application/pdf");
+  EXPECT_EQ(pdf->body.rfind("%PDF", 0), 0u);
+
+  const std::string dossierName = std::filesystem::path(path_).filename().string();
+  const std::pair<std::string, std::string> refused[] = {
+      {other, name},                             // another tab's print
+      {id, "liste1-999.pdf"},                    // none such
+      {id, "../" + dossierName},                 // beside the prints
+      {id, "..%2F" + dossierName},
+      {id, "%2E%2E%2F%2E%2E%2Fetc%2Fpasswd"},
+      {id, ""},
+  };
+  for (const auto& [session, file] : refused) {
+    auto res = client().Get("/api/sessions/" + session + "/impressions/" + file);
+    ASSERT_TRUE(res) << file;
+    EXPECT_EQ(res->status, 404) << file;
+    EXPECT_NE(res->get_header_value("Content-Type"), "application/pdf") << file;
+  }
+}
+
+TEST_F(ServeTest, ASessionLeftIdleIsClosedAndItsTabToldSo) {
+  arreterServeur();
+  demarrer({.dossier = path_, .port = 0, .idleLimit = std::chrono::milliseconds(200)});
+  std::string id = ouvrirSession();
+  std::this_thread::sleep_for(std::chrono::milliseconds(600));
+  std::vector<httplib::Result> answers;
+  answers.push_back(client().Get("/api/sessions/" + id));
+  answers.push_back(client().Post("/api/sessions/" + id + "/gestes", R"({"geste":"fermer"})", "application/json"));
+  answers.push_back(client().Delete("/api/sessions/" + id));
+  for (const auto& res : answers) {
+    ASSERT_TRUE(res);
+    EXPECT_EQ(res->status, 404);
+    EXPECT_EQ(json::parse(res->body)["erreur"], "session expirée");
+  }
+  ouvrirSession();
+}
+
 TEST_F(ServeTest, AForbiddenObjectShownOnThePageCannotBeTypedInto) {
   std::string id = ouvrirSession();
   geste(id, {{"geste", "ouvrir"}, {"module", "MIRVAE-ACCES1"}});
@@ -180,14 +346,29 @@ TEST_F(ServeTest, AMalformedOrForeignRequestGetsItsReasonNeverACrash) {
       {"autre origine", "/api/sessions/" + id + "/gestes", R"({"geste":"fermer"})",
        {{"Origin", "http://ailleurs.example"}}, 403},
       {"requête trop grosse", "/api/sessions/" + id + "/gestes", std::string(200 * 1024, ' '), {}, 413},
+      {"ligne en texte", "/api/sessions/" + id + "/gestes", R"({"geste":"aller_ligne","ligne":"1"})", {}, 400},
+      {"ligne démesurée", "/api/sessions/" + id + "/gestes", R"({"geste":"aller_ligne","ligne":99999999999999999999})", {}, 400},
+      {"ligne décimale", "/api/sessions/" + id + "/gestes", R"({"geste":"choisir_ligne","ligne":1e300})", {}, 400},
+      {"réponses pas en liste", "/api/sessions/" + id + "/gestes", R"({"geste":"fermer","reponses":{}})", {}, 400},
+      {"réponse d'une sorte inconnue", "/api/sessions/" + id + "/gestes",
+       R"({"geste":"fermer","reponses":[{"sorte":"oracle","valeur":"oui"}]})", {}, 400},
+      {"réponse qui n'est pas un texte", "/api/sessions/" + id + "/gestes",
+       R"({"geste":"fermer","reponses":[{"sorte":"dialogue","valeur":[1]}]})", {}, 400},
+      {"gestes d'écran pas en liste", "/api/sessions/" + id + "/gestes",
+       R"({"geste":"fermer","reponses":[{"sorte":"ecran","gestes":"fermer"}]})", {}, 400},
+      {"geste d'écran mal formé", "/api/sessions/" + id + "/gestes",
+       R"({"geste":"fermer","reponses":[{"sorte":"ecran","gestes":[{"geste":"saisir","objet":{"x":1},"texte":""}]}]})",
+       {}, 400},
+      {"bric-à-brac imbriqué", "/api/sessions/" + id + "/gestes",
+       R"({"geste":"fermer","reponses":[{"sorte":"ecran","gestes":[)" + std::string(5000, '[') + std::string(5000, ']') +
+           "]}]}",
+       {}, 400},
   };
   for (const Case& c : cases) {
     auto res = client().Post(c.path, c.headers, c.body, "application/json");
     ASSERT_TRUE(res) << c.what;
     EXPECT_EQ(res->status, c.status) << c.what << " : " << res->body;
-    if (c.status != 413) {
-      EXPECT_TRUE(json::parse(res->body).contains("erreur")) << c.what;
-    }
+    EXPECT_TRUE(json::parse(res->body).contains("erreur")) << c.what;
   }
   // The session still answers.
   json state = geste(id, {{"geste", "ouvrir"}, {"module", "MIRVAE-ACCES1"}});
