@@ -263,6 +263,36 @@ class PageTest(unittest.TestCase):
         self.assertEqual(self.serveur.sql("SELECT count(*), count(DISTINCT NPIES) FROM MIRVAE")[0],
                          (before + 2, before + 2))
 
+    def test_4_la_ventilation_analytique_dans_sa_fenetre(self):
+        page = self.nouvel_onglet()
+        page.ouvrir_liste(2)
+        page.appuyer("CREER")
+        page.ecran("MIRVAE-GESTION2")
+        page.taper("VLIBCP1", "Scierie Maurel Frères")
+        page.geste("nouvelle_ligne")
+        page.taper("LST_MIRVAL.NUMCP", "601000")
+        page.taper("LST_V_HT", "2400")
+        page.geste("valider_ligne")
+        page.lignes()[0].click()
+        page.libre()
+        page.appuyer("BT_ANALYTIQUE")
+        page.attendre(lambda: page.css("dialog#modal").get_attribute("open") is not None, "l'écran analytique")
+        self.assertEqual(page.css("dialog#modal .code-ecran").text, "MIRVAE-GEST_ANA")
+        sections = lambda: [td.text for td in page.tous('dialog#modal td[data-colonne="MIRVAANA_M01.CSECT"]')]
+        self.assertEqual(sections(), ["ATELIER", "CHANTIER"])
+        page.css('dialog#modal button[data-action="VALID_DOC"]').click()
+        page.libre()
+        page.css('dialog#modal button[data-geste="fermer"]').click()
+        page.libre()
+        page.attendre(lambda: page.css("dialog#modal").get_attribute("open") is None, "le retour à la saisie")
+        self.assertEqual(page.css("#code").text, "MIRVAE-GESTION2")
+        self.assertEqual(page.journal("erreur"), [])
+        page.appuyer("B_VALID_DOC")
+        page.repondre("1")
+        self.assertEqual(self.serveur.sql("SELECT group_concat(CSECT || ' ' || (MTADE + 0), ', ') FROM VTSEC JOIN MOUVE "
+                                          "ON MOUVE.UNIQ = VTSEC.MOUVE_UNIQ WHERE NUMCP = '601000'"),
+                         [("ATELIER 1440, CHANTIER 960",)])
+
 
 def captures(folder):
     """The README's pictures: the entry screen of an invoice with its lines, and the list."""
