@@ -14,7 +14,7 @@ cd "$(dirname "$0")"
 packages=(build-essential cmake ninja-build pkg-config libsqlite3-dev sqlite3 libboost-dev libcli11-dev
           libgtest-dev libgmock-dev libbenchmark-dev hledger clang libclang-rt-14-dev
           libcairo2-dev libpango1.0-dev fonts-dejavu-core poppler-utils
-          libcpp-httplib-dev nlohmann-json3-dev)
+          libcpp-httplib-dev nlohmann-json3-dev chromium chromium-driver python3-selenium)
 
 install_missing() {
   local missing=()

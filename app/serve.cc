@@ -20,6 +20,7 @@
 #include <stdexcept>
 #include <thread>
 
+#include "app/screen_layouts.h"
 #include "app/script.h"
 #include "host/automate.h"
 #include "host/error.h"
@@ -598,6 +599,10 @@ struct Serveur::Impl {
 
     http.Get("/", [](const httplib::Request&, httplib::Response& res) {
       res.set_content(serve_page, "text/html; charset=utf-8");
+    });
+    http.Get(R"(/api/dispositions/([A-Z0-9_-]+))", [](const httplib::Request& req, httplib::Response& res) {
+      if (auto layout = dispositionEcran(req.matches[1])) return res.set_content(*layout, "application/json; charset=utf-8");
+      sendJson(res, 404, {{"erreur", "aucune disposition pour « " + std::string(req.matches[1]) + " »"}});
     });
     http.Post("/api/sessions", [this](const httplib::Request&, httplib::Response& res) {
       expire();
