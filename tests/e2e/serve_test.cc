@@ -113,7 +113,7 @@ class ServeTest : public testing_support::DossierTest {
   std::thread serving_;
 };
 
-TEST_F(ServeTest, AnInvoiceTypedOnThePageIsSavedOnceWhenTheDialogIsAnsweredAndNotBefore) {
+TEST_F(ServeTest, AnInvoiceTypedOnThePageIsSavedOnceWhenTheDialogIsAnsweredAndSettledFromTheBank) {
   std::string id = ouvrirSession();
   json state = saisirFacture(id, "Brasserie Lissandre");
   EXPECT_EQ(state["ecran"]["code"], "MIRVAE-GESTION1");
@@ -148,6 +148,38 @@ TEST_F(ServeTest, AnInvoiceTypedOnThePageIsSavedOnceWhenTheDialogIsAnsweredAndNo
   json list = geste(id, {{"geste", "fermer"}});
   EXPECT_EQ(list["ecran"]["code"], "MIRVAE-ACCES1");
   EXPECT_EQ(list["ecran"]["liste"]["lignes"].size(), 1u);
+
+  // The client pays at the bank: the receipt's line opens the justification screen
+  // inside its validation, worked from the page like any modal screen; the invoice's
+  // due date is settled by the saved receipt only.
+  const json line = {{"geste", "valider_ligne"}};
+  jouer(id, {{{"geste", "fermer"}},
+             {{"geste", "ouvrir"}, {"module", "MIRVAE-ACCES4"}},
+             {{"geste", "appuyer"}, {"objet", "CREER"}},
+             {{"geste", "nouvelle_ligne"}},
+             {{"geste", "saisir"}, {"objet", "LST_MIRVAL.NUMCP"}, {"texte", "411001"}},
+             {{"geste", "saisir"}, {"objet", "LST_V_HT"}, {"texte", "1746"}}});
+  json justifying = geste(id, line);
+  EXPECT_EQ(justifying["attente"]["sorte"], "ecran");
+  EXPECT_EQ(justifying["attente"]["etat"]["ecran"]["code"], "MIRVAE-GEST_JUS");
+  EXPECT_EQ(valeur(justifying["attente"]["etat"], "V_RESTE_A_JUSTIF"), "1746.00");
+  json settle = line;
+  settle["reponses"] = {{{"sorte", "ecran"},
+                         {"gestes",
+                          {{{"geste", "aller_ligne"}, {"ligne", 1}},
+                           {{"geste", "appuyer"}, {"objet", "BT_MT_REGLEMENT"}},
+                           {{"geste", "appuyer"}, {"objet", "VALID"}}}}}};
+  json settled = geste(id, settle);
+  EXPECT_TRUE(settled["accepte"]) << settled.dump();
+  EXPECT_EQ(settled["ecran"]["code"], "MIRVAE-GESTION4");
+  const std::string open = "SELECT count(*) FROM ECHEA WHERE UNIQR = 0";
+  EXPECT_EQ(sql(open), "1");
+  jouer(id, {{{"geste", "appuyer"}, {"objet", "B_VALID_DOC"}, {"reponses", {{{"sorte", "dialogue"}, {"valeur", "1"}}}}}});
+  EXPECT_EQ(sql(open), "0");
+  EXPECT_EQ(sql("SELECT count(DISTINCT RELET) || ' ' || min(RELET = upper(RELET) AND RELET <> '') FROM MOUVE "
+                "WHERE NUMCP = '411001'"),
+            "1 1");
+  EXPECT_EQ(testing_support::incoherences(base()), std::vector<std::string>{});
 }
 
 TEST_F(ServeTest, TwoTabsEnterInvoicesAtOnceEachInItsOwnSession) {
