@@ -564,6 +564,13 @@ struct Serveur::Impl {
 
   void routes() {
     http.set_payload_max_length(kMaxRequest);
+    // No other site may show the page in a frame of its own (to make the person click
+    // on the books unawares), and no answer is read as another type than it says.
+    http.set_post_routing_handler([](const httplib::Request&, httplib::Response& res) {
+      res.set_header("X-Frame-Options", "DENY");
+      res.set_header("Content-Security-Policy", "frame-ancestors 'none'");
+      res.set_header("X-Content-Type-Options", "nosniff");
+    });
     http.set_pre_routing_handler([this](const httplib::Request& req, httplib::Response& res) {
       if (!foreignOrigin(req)) return httplib::Server::HandlerResponse::Unhandled;
       sendJson(res, 403, {{"erreur", "requête d'une autre origine refusée"}});

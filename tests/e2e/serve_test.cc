@@ -429,6 +429,7 @@ TEST_F(ServeTest, OnlyALoopbackAddressIsBoundUnlessAskedAndThePageIsServed) {
   ASSERT_TRUE(page);
   EXPECT_EQ(page->status, 200);
   EXPECT_NE(page->body.find("/api/sessions"), std::string::npos);
+  EXPECT_EQ(page->get_header_value("X-Frame-Options"), "DENY");
 }
 
 }  // namespace
