@@ -293,6 +293,38 @@ class PageTest(unittest.TestCase):
                                           "ON MOUVE.UNIQ = VTSEC.MOUVE_UNIQ WHERE NUMCP = '601000'"),
                          [("ATELIER 1440, CHANTIER 960",)])
 
+    def test_5_un_reglement_justifie_dans_sa_fenetre(self):
+        # The bank receipt of the invoice of the first case opens the justification
+        # screen inside its line's validation; the due date is settled on it.
+        page = self.nouvel_onglet()
+        page.ouvrir_liste(4)
+        page.appuyer("CREER")
+        page.ecran("MIRVAE-GESTION4")
+        page.geste("nouvelle_ligne")
+        page.taper("LST_MIRVAL.NUMCP", "411001")
+        page.taper("LST_V_HT", "1794")
+        modal = lambda: page.css("dialog#modal").get_attribute("open") is not None
+        if not modal():
+            page.geste("valider_ligne")
+        page.attendre(modal, "l'écran de justification")
+        self.assertEqual(page.css("dialog#modal .code-ecran").text, "MIRVAE-GEST_JUS")
+        page.css("dialog#modal table tbody tr").click()
+        page.libre()
+        page.css('dialog#modal button[data-action="BT_MT_REGLEMENT"]').click()
+        page.libre()
+        page.css('dialog#modal button[data-action="VALID"]').click()
+        page.libre()
+        page.attendre(lambda: not modal(), "le retour à la saisie")
+        self.assertEqual(page.css("#code").text, "MIRVAE-GESTION4")
+        self.assertEqual(page.journal("erreur"), [])
+        page.appuyer("B_VALID_DOC")
+        page.repondre("1")
+        self.assertEqual(page.journal("erreur"), [])
+        self.assertEqual(self.serveur.sql("SELECT count(*) FROM ECHEA JOIN MOUVE ON MOUVE.UNIQ = ECHEA.UNIQ "
+                                          "WHERE NUMCP = '411001' AND UNIQR = 0"), [(0,)])
+        self.assertEqual(self.serveur.sql("SELECT count(DISTINCT RELET), min(RELET = upper(RELET) AND RELET <> '') "
+                                          "FROM MOUVE WHERE NUMCP = '411001'"), [(1, 1)])
+
 
 def captures(folder):
     """The README's pictures: the entry screen of an invoice with its lines, and the list."""
